@@ -1,0 +1,248 @@
+#include <zelmar/ZelmarException.h>
+#include <zelmar/internal/Ascii.h>
+#include <zelmar/metaobj/MetaList.h>
+#include <zelmar/metaobj/MetaScalars.h>
+#include <zelmar/metaobj/MetaStruct.h>
+
+using Zelmar::ZelmarException;
+
+namespace MetaObj {
+
+namespace {
+
+void Report(std::vector<std::string>* errors, std::string message) {
+    if (errors) {
+        errors->push_back(std::move(message));
+    }
+}
+
+template <class Values>
+std::shared_ptr<MetaList> ListOf(MetaType type, Values&& values) {
+    auto list = MetaList::New(type);
+    list->AddAll(std::forward<Values>(values));
+    return list;
+}
+
+}  // namespace
+
+const std::string MetaStruct::_docEmpty;
+const std::string MetaStruct::_docMissingStaticString = "Documentation missing";
+
+bool IsValidStructName(const std::string& name) {
+    return Ascii::ConsistsOf(name, Ascii::IsAlnum);
+}
+
+bool IsValidFieldName(const std::string& /*name*/) {
+    return true;
+}
+
+MetaStruct::MetaStruct(std::string&& typeName, FactoryFlag flag)
+    : MetaObject(MetaType::Struct, flag), _typeName(std::move(typeName)) {
+    if (!IsValidStructName(_typeName)) {
+        throw ZelmarException("Invalid name specified for MetaStruct: " + _typeName);
+    }
+}
+
+MetaStruct::MetaStruct(const std::shared_ptr<MetaStruct>& definition, FactoryFlag flag)
+    : MetaObject(MetaType::Struct, flag),
+      _structureDefinition(definition),
+      _typeName(definition->_typeName) {
+    definition->LockStructure();
+}
+
+std::shared_ptr<MetaStruct> MetaStruct::New(const std::string& typeName) {
+    return New(std::string(typeName));
+}
+
+std::shared_ptr<MetaStruct> MetaStruct::New(std::string&& typeName) {
+    return std::make_shared<MetaStruct>(std::move(typeName), FactoryFlag());
+}
+
+std::shared_ptr<MetaStruct> MetaStruct::New(const char* typeName) {
+    return New(std::string(typeName));
+}
+
+std::shared_ptr<MetaStruct> MetaStruct::New(const std::shared_ptr<MetaStruct>& definition) {
+    return std::make_shared<MetaStruct>(definition, FactoryFlag());
+}
+
+std::shared_ptr<MetaStruct> MetaStruct::GetStructureDefinition() const {
+    return _structureDefinition;
+}
+
+bool MetaStruct::MatchesStructureDefinition() const {
+    return !_structureDefinition || IsSameStructure(_structureDefinition, nullptr);
+}
+
+void MetaStruct::SetField(const std::string& name, const std::shared_ptr<MetaObject>& value,
+                          const std::string& documentation) {
+    Store(name, value, documentation);
+}
+
+void MetaStruct::SetField(const std::string& name, long value) {
+    Store(name, MetaInt::New(value), _docEmpty);
+}
+
+void MetaStruct::SetField(const std::string& name, int value) {
+    Store(name, MetaInt::New(value), _docEmpty);
+}
+
+void MetaStruct::SetField(const std::string& name, bool value) {
+    Store(name, MetaBool::New(value), _docEmpty);
+}
+
+void MetaStruct::SetField(const std::string& name, const std::string& value) {
+    Store(name, MetaString::New(value), _docEmpty);
+}
+
+void MetaStruct::SetField(const std::string& name, std::string&& value) {
+    Store(name, MetaString::New(std::move(value)), _docEmpty);
+}
+
+void MetaStruct::SetField(const std::string& name, const char* value) {
+    Store(name, MetaString::New(value), _docEmpty);
+}
+
+void MetaStruct::SetField(const std::string& name, const std::vector<std::string>& values) {
+    Store(name, ListOf(MetaType::String, values), _docEmpty);
+}
+
+void MetaStruct::SetField(const std::string& name, std::vector<std::string>&& values) {
+    Store(name, ListOf(MetaType::String, std::move(values)), _docEmpty);
+}
+
+void MetaStruct::SetField(const std::string& name, const std::vector<long>& values) {
+    Store(name, ListOf(MetaType::Int, values), _docEmpty);
+}
+
+void MetaStruct::SetField(const std::string& name, const std::vector<bool>& values) {
+    Store(name, ListOf(MetaType::Bool, values), _docEmpty);
+}
+
+void MetaStruct::Store(const std::string& name, std::shared_ptr<MetaObject> value,
+                       const std::string& documentation) {
+    if (!value) {
+        throw ZelmarException("Invalid NULL value was assigned to the field " + name +
+                              " in the structure " + _typeName);
+    }
+    const auto place = _fields.lower_bound(name);
+    if (place != _fields.end() && place->first == name) {
+        place->second = Field(std::move(value), documentation);
+    } else {
+        RequireNewFieldAllowed(name);
+        _fields.emplace_hint(place, std::piecewise_construct, std::forward_as_tuple(name),
+                             std::forward_as_tuple(std::move(value), documentation));
+    }
+}
+
+// A field that exists needs no such test: it can only have come in by passing it.
+void MetaStruct::RequireNewFieldAllowed(const std::string& name) const {
+    if (_locked) {
+        throw ZelmarException("Unable to set new field " + name +
+                              " on structure. Structure has been locked");
+    }
+    if (_structureDefinition && !_structureDefinition->HasField(name)) {
+        throw ZelmarException("Unable to set new field " + name +
+                              " on structure.  The field does not match the Structure definition"
+                              " for this MetaStruct.");
+    }
+}
+
+bool MetaStruct::HasField(const std::string& name) const {
+    return _fields.contains(name);
+}
+
+std::shared_ptr<MetaObject> MetaStruct::GetField(const std::string& name) const {
+    const auto field = _fields.find(name);
+    return field == _fields.end() ? nullptr : field->second.value;
+}
+
+std::vector<std::string> MetaStruct::GetFieldNames() const {
+    std::vector<std::string> names;
+    names.reserve(_fields.size());
+    for (const auto& [name, field] : _fields) {
+        names.push_back(name);
+    }
+    return names;
+}
+
+const std::string& MetaStruct::GetFieldDocumentation(const std::string& name) const {
+    const auto field = _fields.find(name);
+    if (field == _fields.end()) {
+        throw ZelmarException("Field " + name + " is not present in the structure " + _typeName);
+    }
+    const std::string& documentation = field->second.documentation;
+    return documentation.empty() ? _docMissingStaticString : documentation;
+}
+
+MetaType MetaStruct::GetFieldType(const std::string& name) const {
+    const auto field = _fields.find(name);
+    if (field == _fields.end()) {
+        throw 1;
+    }
+    return field->second.value->GetType();
+}
+
+void MetaStruct::RemoveField(const std::string& name) {
+    if (_locked) {
+        throw ZelmarException("Structure is locked, unable to remove fields");
+    }
+    _fields.erase(name);
+}
+
+bool MetaStruct::IsSameStructure(const std::shared_ptr<MetaObject>& other,
+                                 std::vector<std::string>* errors) const {
+    if (!other) {
+        Report(errors, "Invalid NULL input to MetaStruct validation.");
+        return false;
+    }
+    if (other->GetType() != MetaType::Struct) {
+        Report(errors, "Type Mismatch in MetaStruct Validation: Expected type Struct got type " +
+                           MetaTypeString(other->GetType()));
+        return false;
+    }
+    const auto* input = MetaCast<MetaStruct>(other.get());
+    if (!input) {
+        Report(errors, "Unable to cast to MetaStruct, runtime error?");
+        return false;
+    }
+    if (input->_typeName != _typeName) {
+        Report(errors, "Type names do not match.");
+    }
+    const bool sameCount = input->_fields.size() == _fields.size();
+    if (!sameCount) {
+        Report(errors, "Mismatch on number of fields set in struct. Expected " +
+                           std::to_string(_fields.size()) + " found " +
+                           std::to_string(input->_fields.size()));
+    }
+    // The fields are looked at even when their count is wrong: the missing one is worth naming.
+    return FieldsMatch(*input, errors) && sameCount;
+}
+
+bool MetaStruct::FieldsMatch(const MetaStruct& other, std::vector<std::string>* errors) const {
+    for (const auto& [name, field] : _fields) {
+        const auto input = other._fields.find(name);
+        if (input == other._fields.end()) {
+            Report(errors, "Missing field in input: " + name);
+            return false;
+        }
+        const std::shared_ptr<MetaObject>& value = input->second.value;
+        if (field.value->GetType() != value->GetType() ||
+            !field.value->IsSameStructure(value, errors)) {
+            Report(errors, "Type mismatch on field: " + name);
+            return false;
+        }
+    }
+    return true;
+}
+
+std::string MetaStruct::ToString() const {
+    std::string text = "{";
+    for (const auto& [name, field] : _fields) {
+        text.append("'").append(name).append("' => '").append(field.value->ToString());
+        text.append("', ");
+    }
+    return text + "}";
+}
+
+}  // namespace MetaObj

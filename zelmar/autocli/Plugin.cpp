@@ -1,0 +1,7 @@
+#include <zelmar/autocli/Plugin.h>
+
+namespace AutoCli {
+
+Plugin::~Plugin() = default;
+
+}  // namespace AutoCli

@@ -20,7 +20,7 @@ FLOORS = [
     (2, r"zelmar/callspec/.*"),
     (3, r"zelmar/autocli/formatters/.*"),
     (4, r"zelmar/autocli/(NamespaceNode|Namespace|CommandSpec|Command|CommandInput|CommandOutput"
-        r"|Plugin)\.\w+"),
+        r"|CommandHelp|Plugin)\.\w+"),
     (5, r"zelmar/(internal/xml|autocli/extension)/.*"),
     (6, r"zelmar/autocli/[^/]*"),
     (7, r"kelvash/.*"),

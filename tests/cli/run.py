@@ -28,8 +28,9 @@ in which
     plugins       is where the example plugins are built
     test-plugins  is where the plugins of the tests are built
 
-with the built tool first in PATH, HOME in that directory, standard input empty unless there is a
-section, and no locale nor any other variable of the caller except those of the sanitizers.
+with the built tool first in PATH, HOME in that directory, KELVASH_COMMANDS at the scripts of
+examples/commands, standard input empty unless there is a section, and no locale nor any other
+variable of the caller except those of the sanitizers.
 """
 
 import argparse
@@ -120,6 +121,7 @@ class Case:
                            if name.endswith("SAN_OPTIONS")}
             environment["PATH"] = f"{build}/bin:/usr/local/bin:/usr/bin:/bin:/usr/sbin:/sbin"
             environment["HOME"] = directory
+            environment["KELVASH_COMMANDS"] = "commands/scripts"
             done = subprocess.run(["sh", "-c", self.command], input=self.stdin, cwd=directory,
                                   env=environment, capture_output=True, timeout=TIME_LIMIT,
                                   start_new_session=True, check=False)

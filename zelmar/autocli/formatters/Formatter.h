@@ -66,6 +66,10 @@ ZELMAR_EXPORT std::string AutoCli_FormatField(const std::string& typeName,
                                               std::shared_ptr<MetaObj::MetaObject> value,
                                               FormatParameters& parameters);
 
+/// Is there any parameter at all that `AutoCli_FormatField` would heed? Where there is none, it
+/// gives the value's own text.
+ZELMAR_EXPORT bool HasFieldFormats(const FormatParameters& parameters);
+
 /// Three blanks for each level; none below level 1.
 ZELMAR_EXPORT std::string GetIndent(int level);
 

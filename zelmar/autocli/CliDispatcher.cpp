@@ -1,0 +1,320 @@
+#include <zelmar/ZelmarException.h>
+#include <zelmar/autocli/CliDispatcher.h>
+#include <zelmar/autocli/OptionParser.h>
+#include <zelmar/autocli/formatters/CliDispatcherHelpFormatter.h>
+#include <zelmar/internal/Ascii.h>
+#include <zelmar/internal/BlockOutput.h>
+
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <array>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <iostream>
+#include <string_view>
+
+using CallSpec::Output;
+using MetaObj::MetaList;
+using MetaObj::MetaStruct;
+using MetaObj::MetaType;
+using Zelmar::ZelmarException;
+
+namespace AutoCli {
+
+namespace {
+
+constexpr std::array<std::string_view, 7> dispatcherOptions = {
+    "h", "help", "formatter", "plugin-dir", "plugin", "format-param", "screen-width"};
+
+constexpr int widestScreen = 9999;
+
+// 0 until `--screen-width` is heeded; then it holds for the later lines of a stream too.
+int screenWidthOverride = 0;
+
+bool IsKeyCharacter(char c) {
+    return Ascii::IsAlnum(c) || std::string_view(" .-:").find(c) != std::string_view::npos;
+}
+
+// "<key>=<value>", where the key ends at the first equals sign.
+bool SetFormatParameter(const std::string& text, FormatParameters& parameters) {
+    const size_t equals = text.find('=');
+    if (equals == std::string::npos || equals + 1 == text.size()) {
+        return false;
+    }
+    std::string key = text.substr(0, equals);
+    if (!Ascii::ConsistsOf(key, IsKeyCharacter)) {
+        return false;
+    }
+    parameters.SetParameter(std::move(key), text.substr(equals + 1));
+    return true;
+}
+
+void ChooseFormatter(const OptionParser& parser, FormatParameters& overrides, Output& output) {
+    const auto names = parser.GetDispatcherParameter("formatter");
+    if (names.size() > 1) {
+        output.AddErrorMessage("Only one --formatter option can be passed to a command");
+    } else if (names.size() == 1 && names.front().empty()) {
+        output.AddErrorMessage(
+            "--formatter requires the name of the formatter to use for this command");
+    } else if (names.size() == 1) {
+        overrides.SetFormatter(names.front());
+    }
+}
+
+const char* WordFor(NamespaceNodeType type) {
+    switch (type) {
+        case NodeTypeNamespace:
+            return "Namespace";
+        case NodeTypeCommand:
+            return "Command";
+        default:
+            return "Unknown";
+    }
+}
+
+std::shared_ptr<MetaList> ListOfNames(const std::list<std::string>& names) {
+    auto list = MetaList::New(MetaType::String);
+    list->Reserve(names.size());
+    for (const std::string& name : names) {
+        list->Add(name);
+    }
+    return list;
+}
+
+std::shared_ptr<MetaList> ListOfChildren(NamespaceNode& node) {
+    const auto shape = MetaStruct::New("NamespaceNode");
+    shape->SetField("Name", "");
+    shape->SetField("Description", "");
+    shape->SetField("Type", "");
+    auto list = MetaList::New(MetaType::Struct, shape);
+    for (const auto& child : node.GetNamespaceNodes()) {
+        auto entry = MetaStruct::New(shape);
+        entry->SetField("Name", child->GetName());
+        entry->SetField("Description", child->GetDescription());
+        entry->SetField("Type", WordFor(child->GetType()));
+        list->Add(entry);
+    }
+    return list;
+}
+
+}  // namespace
+
+CliDispatcher::CliDispatcher() = default;
+
+CliDispatcher::~CliDispatcher() = default;
+
+void CliDispatcher::HandleArgvInput(int argc, const char* const* argv) {
+    OptionParser parser;
+    parser.ParseArgv(argc, argv);
+    std::exit(HandleOptions(parser, true) ? EXIT_SUCCESS : EXIT_FAILURE);
+}
+
+bool CliDispatcher::HandleOptions(OptionParser& parser, bool allowInput) {
+    const auto output = CommandOutput::New();
+    if (ReportParseErrors(parser, output)) {
+        return false;
+    }
+    _dispatcherName = parser.GetDispatcher();
+    FormatParameters overrides;
+    if (!HandleDispatcherOptions(parser, overrides, output)) {
+        std::exit(EXIT_FAILURE);
+    }
+    if (allowInput && parser.HasDispatcherParameter("input")) {
+        return HandleInput(parser);
+    }
+    std::list<std::string> path = parser.GetCommandPath();
+    const auto node = GetRootNamespace()->ResolveNode(path);
+    bool result = false;
+    if (const auto command = std::dynamic_pointer_cast<Command>(node)) {
+        result = HandleCommand(parser, *command, overrides, output);
+    } else {
+        PrintChildren(node ? node : GetRootNamespace(), output);
+    }
+    PrintError(output);
+    return result && !output->HasError();
+}
+
+bool CliDispatcher::ReportParseErrors(const OptionParser& parser,
+                                      const std::shared_ptr<CommandOutput>& output) {
+    for (const std::string& error : parser.GetParseErrors()) {
+        output->AddErrorMessage(error);
+    }
+    PrintError(output);
+    return output->HasError();
+}
+
+// What the line says beside `--input`, complaints about it included, does not reach the stream.
+bool CliDispatcher::HandleInput(const OptionParser& parser) {
+    const auto names = parser.GetDispatcherParameter("input");
+    if (names.size() != 1) {
+        std::cerr << "Only one --input dispatch parameter is allowed" << std::endl;
+        return false;
+    }
+    const std::string& name = names.front();
+    if (name == "STDIN") {
+        return ParseStreamInput(std::cin);
+    }
+    std::ifstream file(name);
+    std::error_code noError;
+    if (!file || std::filesystem::is_directory(name, noError)) {
+        std::cerr << "Unable to open file " << name << std::endl;
+        return false;
+    }
+    return ParseStreamInput(file);
+}
+
+bool CliDispatcher::ParseStreamInput(std::istream& stream) {
+    bool result = true;
+    std::string line;
+    while (std::getline(stream, line)) {
+        OptionParser parser;
+        if (!parser.ParseString(line)) {
+            result = HandleOptions(parser, false);
+        }
+    }
+    return result;
+}
+
+bool CliDispatcher::HandleCommand(OptionParser& parser, Command& command,
+                                  const FormatParameters& overrides,
+                                  const std::shared_ptr<CommandOutput>& output) {
+    const auto input = CommandInput::New();
+    input->SetDispatcher(parser.GetDispatcher());
+    input->SetCommandPath(parser.GetCommandPath());
+    parser.SetInputSpec(command.GetInputSpec());
+    for (const auto& [name, value] : parser.GetCommandParameters()) {
+        input->AddParameter(name, value);
+    }
+    // Complaints about the dispatcher's options count here as well: the command does not run.
+    for (const std::string& error : parser.GetParseErrors()) {
+        output->AddErrorMessage(error);
+    }
+    return !output->HasError() && ExecuteCommand(input, output) &&
+           PrintOutput(input, output, overrides);
+}
+
+bool CliDispatcher::PrintOutput(const std::shared_ptr<CommandInput>& input,
+                                const std::shared_ptr<CommandOutput>& output,
+                                const FormatParameters& overrides) {
+    FormatParameters format;
+    if (output->GetOutputType() == Output::OutputTypeNormal) {
+        format = GetDefaultOutputFormatParameters(input, output);
+    } else if (output->GetOutputType() == Output::OutputTypeHelp) {
+        format = GetHelpFormatParams();
+    }
+    format.OverrideValues(overrides);
+    DisplayContext context;
+    GetDisplayContext(context);
+    return FormatOutput(output, format, context, std::cout);
+}
+
+bool CliDispatcher::HandleDispatcherOptions(OptionParser& parser, FormatParameters& overrides,
+                                            const std::shared_ptr<Output>& output) {
+    ValidateDispatcherParameters(parser, output);
+    if (parser.HasDispatcherParameter("h") || parser.HasDispatcherParameter("help")) {
+        PrintUsage();
+        return false;
+    }
+    if (const auto widths = parser.GetDispatcherParameter("screen-width"); !widths.empty()) {
+        screenWidthOverride = static_cast<int>(std::strtol(widths.back().c_str(), nullptr, 0));
+    }
+    ChooseFormatter(parser, overrides, *output);
+    LoadPlugins(parser);
+    for (const std::string& parameter : parser.GetDispatcherParameter("format-param")) {
+        if (!SetFormatParameter(parameter, overrides)) {
+            output->AddErrorMessage("Unable to read format parameter " + parameter);
+        }
+    }
+    return true;
+}
+
+void CliDispatcher::ValidateDispatcherParameters(OptionParser& parser,
+                                                 const std::shared_ptr<Output>& output) {
+    for (const auto& [name, value] : parser.GetDispatcherParameters()) {
+        if (std::ranges::find(dispatcherOptions, name) == dispatcherOptions.end()) {
+            output->AddErrorMessage("Unknown dispatcher parameter: " + name);
+        }
+    }
+}
+
+void CliDispatcher::LoadPlugins(const OptionParser& parser) {
+    for (const std::string& directory : parser.GetDispatcherParameter("plugin-dir")) {
+        if (!directory.empty()) {
+            AddExternalDirectory(directory);
+        }
+    }
+    for (const std::string& path : parser.GetDispatcherParameter("plugin")) {
+        try {
+            AddPlugin(path);
+        } catch (const ZelmarException& error) {
+            std::cerr << "Unable to load plugin " << path << ": " << error.what() << std::endl;
+        }
+    }
+}
+
+void CliDispatcher::PrintUsage() const {
+    std::cout << _dispatcherName << " [dispatcher options] <namespaces> <command> [options]\n"
+              << "      For a list of available namespaces run " << _dispatcherName
+              << " with no arguments.  \n"
+              << "      Objects can be listed by specifying just the namespace.\n"
+                 "      Commands can be listed by specifying the namespace and object.\n"
+                 "\n"
+                 " Dispatcher Options: \n"
+                 "       --plugin-dir                    Add all the plug-ins from this directory\n"
+                 "       --plugin                        Add a specific file plugin.  (Multiple"
+                 " --plugin options can be passed.)\n"
+                 "       --formatter <formatter>         Override the formatter to use for a given"
+                 " command\n"
+                 "       --format-param <key>=<value>    Set a formatter parameter to give the"
+                 " formatter information about how to format the command\n"
+                 "       --screen-width <width>          Use the specified screen width when"
+                 " formatting text\n"
+                 "    -h|--help                          Show this message.\n"
+              << std::endl;
+}
+
+void CliDispatcher::GetDisplayContext(DisplayContext& context) {
+    winsize terminal = {};
+    if (ioctl(STDOUT_FILENO, TIOCGWINSZ, &terminal) == 0) {
+        context.screenWidth = terminal.ws_col;
+        context.screenHeight = terminal.ws_row;
+    }
+    if (screenWidthOverride >= 1 && screenWidthOverride <= widestScreen) {
+        context.screenWidth = static_cast<uint16_t>(screenWidthOverride);
+    }
+}
+
+FormatParameters CliDispatcher::GetHelpFormatParams() {
+    FormatParameters parameters;
+    parameters.SetFormatter("commandhelp");
+    return parameters;
+}
+
+void CliDispatcher::PrintChildren(std::shared_ptr<NamespaceNode> node,
+                                  std::shared_ptr<CommandOutput> output) {
+    const auto page = MetaStruct::New("KelvashCommandPrint");
+    page->SetField("Dispatcher", _dispatcherName);
+    page->SetField("Path", ListOfNames(node->GetPath()));
+    page->SetField("NamespaceNodes", ListOfChildren(*node));
+    output->SetRootObject(page);
+    FormatParameters parameters = GetHelpFormatParams();
+    DisplayContext context;
+    GetDisplayContext(context);
+    const BlockOutput blocks(std::cout);
+    CliDispatcherHelpFormatter().Format(output, parameters, context, std::cout);
+}
+
+void CliDispatcher::PrintError(const std::shared_ptr<Output>& output) {
+    if (!output->HasError()) {
+        return;
+    }
+    std::cerr << "Errors: " << std::endl;
+    for (const std::string& error : output->GetErrors()) {
+        std::cerr << error << std::endl;
+    }
+}
+
+}  // namespace AutoCli

@@ -1,0 +1,96 @@
+#include <zelmar/autocli/formatters/Formatter.h>
+#include <zelmar/internal/SafePrintf.h>
+#include <zelmar/metaobj/MetaScalars.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <system_error>
+
+using MetaObj::MetaBool;
+using MetaObj::MetaCast;
+using MetaObj::MetaInt;
+using MetaObj::MetaObject;
+using MetaObj::MetaString;
+using MetaObj::MetaStruct;
+
+namespace AutoCli {
+
+namespace {
+
+bool HasKeyWithPrefix(const FormatParameters& parameters, const std::string& prefix) {
+    const auto key = parameters.GetParameters().lower_bound(prefix);
+    return key != parameters.GetParameters().end() && key->first.starts_with(prefix);
+}
+
+// False when the format fails; a struct or a list has no printf argument and comes out empty.
+bool ApplyPrintf(const std::string& format, const MetaObject& value, std::string& text) {
+    constexpr size_t slack = 64;
+    const size_t limit = format.size() + text.size() + slack;
+    if (const auto* number = MetaCast<MetaInt>(&value)) {
+        return FormatSafely(format, number->GetValue(), limit, text);
+    }
+    if (const auto* truth = MetaCast<MetaBool>(&value)) {
+        return FormatSafely(format, truth->GetValue() ? 1L : 0L, limit, text);
+    }
+    if (const auto* string = MetaCast<MetaString>(&value)) {
+        return FormatSafely(format, string->GetValue().c_str(), limit, text);
+    }
+    text.clear();
+    return true;
+}
+
+}  // namespace
+
+Formatter::~Formatter() = default;
+
+bool HasFieldFormats(const FormatParameters& parameters) {
+    return HasKeyWithPrefix(parameters, "printf:") || HasKeyWithPrefix(parameters, "units:");
+}
+
+std::string AutoCli_FormatField(const std::string& typeName, const std::string& fieldName,
+                                std::shared_ptr<MetaObject> value, FormatParameters& parameters) {
+    if (!value) {
+        return "NULL Object";
+    }
+    std::string text = value->ToString();
+    if (!HasFieldFormats(parameters)) {
+        return text;
+    }
+    const std::string field = typeName + "." + fieldName;
+    const std::string printfKey = "printf:" + field;
+    if (parameters.HasParameter(printfKey) &&
+        !ApplyPrintf(parameters.GetParameter(printfKey), *value, text)) {
+        return "Error while handling formatting parameter " + printfKey +
+               ".  Unable to format field: " + std::generic_category().message(errno);
+    }
+    const std::string unitsKey = "units:" + field;
+    if (parameters.HasParameter(unitsKey)) {
+        text += " " + parameters.GetParameter(unitsKey);
+    }
+    return text;
+}
+
+std::string GetIndent(int level) {
+    return std::string(static_cast<size_t>(std::max(level, 0)) * 3, ' ');
+}
+
+std::shared_ptr<MetaObject> GetSubField(std::shared_ptr<MetaStruct> structure,
+                                        const std::string& path) {
+    size_t start = 0;
+    while (true) {
+        const size_t dot = path.find('.', start);
+        auto value = structure->GetField(path.substr(start, dot - start));
+        if (dot == std::string::npos) {
+            return value;
+        }
+        if (value) {
+            structure = std::dynamic_pointer_cast<MetaStruct>(value);
+            if (!structure) {
+                return nullptr;
+            }
+        }
+        start = dot + 1;
+    }
+}
+
+}  // namespace AutoCli

@@ -1,7 +1,9 @@
 #!/usr/bin/env python3
 """Runs the snippets of documentation pages, so that the pages cannot rot.
 
-    run.py --build BUILD PAGE...
+    run.py --build BUILD [--update] PAGE...
+
+With --update the pages get what their commands printed, to be read before it is kept.
 
 A page is one shell session in an empty folder, with the tool of BUILD on the PATH and with
 `examples`, a link to the examples of this repository. Its fenced blocks are taken in order:
@@ -78,17 +80,26 @@ class Session:
         (self.folder / "script").write_text(self.script)
         subprocess.run(["/bin/sh", self.folder / "script"], cwd=work, env=environment,
                        stdin=subprocess.DEVNULL, timeout=TIME_LIMIT, check=False)
-        return [self.complaint(*command) for command in self.commands]
+        # (line in the page, command, expected text, printed text) of each that gave something else
+        results = [(*command, self.printed(command[0])) for command in self.commands]
+        return [result for result in results if not re.fullmatch(pattern(result[2]), result[3])]
 
-    def complaint(self, line, command, expected):
+    def printed(self, line):
         try:
-            printed = (self.folder / f"out-{line}").read_text(errors="backslashreplace")
+            return (self.folder / f"out-{line}").read_text(errors="backslashreplace")
         except FileNotFoundError:
-            printed = "(did not run: the session ended before it)\n"
-        if re.fullmatch(pattern(expected), printed):
-            return ""
+            return "(did not run: the session ended before it)\n"
+
+    def complaint(self, line, command, expected, printed):
         lines = difflib.unified_diff(expected.splitlines(), printed.splitlines(), lineterm="", n=99)
         return f"{self.page}:{line}: $ {command}" + "\n".join(list(lines)[3:]) + "\n"
+
+    def update(self, differences):
+        lines = self.page.read_text().splitlines(keepends=True)
+        for line, command, expected, printed in reversed(differences):
+            start = line - 1 + command.count("\n")
+            lines[start:start + expected.count("\n")] = [printed]
+        self.page.write_text("".join(lines))
 
 
 def pattern(expected):
@@ -97,23 +108,29 @@ def pattern(expected):
                    for line in expected.splitlines(keepends=True))
 
 
-def check(page, build):
+def check(page, build, update):
+    """What the page shows wrongly."""
     text = page.read_text()
     with tempfile.TemporaryDirectory() as folder:
         session = Session(page, pathlib.Path(folder))
         for fence in FENCE.finditer(text):
             options = dict(option.split("=", 1) for option in fence[2].split())
             session.add_block(fence[1], options, fence[3], text.count("\n", 0, fence.start()) + 1)
-        return [complaint for complaint in session.run(build) if complaint]
+        differences = session.run(build)
+    if update:
+        session.update(differences)
+    return [session.complaint(*difference) for difference in differences]
 
 
 def main():
     parser = argparse.ArgumentParser()
     parser.add_argument("--build", type=pathlib.Path, required=True)
+    parser.add_argument("--update", action="store_true")
     parser.add_argument("pages", type=pathlib.Path, nargs="+")
     arguments = parser.parse_args()
     build = arguments.build.resolve()
-    complaints = [complaint for page in arguments.pages for complaint in check(page, build)]
+    complaints = [complaint for page in arguments.pages
+                  for complaint in check(page, build, arguments.update)]
     sys.exit("\n".join(complaints) or 0)
 
 

@@ -74,7 +74,7 @@ def check_pkg_config(prefix, compiler, scratch):
 
 def check_tool(prefix):
     """The tool finds its library from where it stands."""
-    run(prefix / "bin/kelvash", "command", "list", "--formatter", "table")
+    run(prefix / "bin/kelvash", "kelvash", "command", "list")
 
 
 def main():

@@ -1,0 +1,12 @@
+// What a call of the tool costs before any command runs: whole processes, from spawn to wait.
+
+#include "Paired.h"
+
+int main() {
+    // A listing ends with 1, for no command has run.
+    const auto kelvash = [] { Paired::RunProgram({.words = {KELVASH}, .status = 1}); };
+    const auto floor = [] { Paired::RunProgram({.words = {FLOOR}}); };
+    Paired::Compare(
+        "start-up: kelvash lists an empty tree", 500,
+        {{"kelvash", kelvash}, {"same libraries, one expression, one line", floor, "at most 1.3"}});
+}

@@ -91,7 +91,7 @@ def judge_umbrella(root):
 def is_listed(root, path):
     """Whether the list of sources beside the file names it."""
     lists = (root / path).parent / "CMakeLists.txt"
-    return lists.is_file() and pathlib.PurePath(path).name in lists.read_text().split()
+    return lists.is_file() and pathlib.PurePath(path).name in re.split(r"[\s()]+", lists.read_text())
 
 
 def judge_sources(root, built):

@@ -2,7 +2,7 @@
 
 namespace {
 
-constexpr std::streamsize blockSize = 64 * 1024;
+constexpr std::streamsize blockSize = std::streamsize{64} * 1024;
 
 // Setting a stream's buffer clears its state, which is put back. A stream that is told to throw
 // does so only behind the change, and its owner will hear of the state with the next write.

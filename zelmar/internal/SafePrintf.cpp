@@ -127,7 +127,7 @@ bool Format(const std::string& format, const ArgumentKind& kind, Value value, si
     if (std::snprintf(buffer.data(), buffer.size(), safe->c_str(), value) < 0) {
         return false;
     }
-    result = buffer.c_str();
+    result = buffer.data();
     return true;
 }
 

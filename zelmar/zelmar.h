@@ -22,7 +22,11 @@
 #include <zelmar/autocli/formatters/FitString.h>
 #include <zelmar/autocli/formatters/FormatParameters.h>
 #include <zelmar/autocli/formatters/Formatter.h>
+#include <zelmar/autocli/formatters/JsonFormatter.h>
+#include <zelmar/autocli/formatters/PythonFormatter.h>
+#include <zelmar/autocli/formatters/SimpleFormatter.h>
 #include <zelmar/autocli/formatters/TableFormatter.h>
+#include <zelmar/autocli/formatters/XmlFormatter.h>
 #include <zelmar/callspec/CallTarget.h>
 #include <zelmar/callspec/Input.h>
 #include <zelmar/callspec/InputSpec.h>

@@ -16,7 +16,7 @@ import sys
 FLOORS = [
     (0, r"zelmar/(Export|ZelmarException)\.\w+"),
     (0, r"zelmar/internal/(platform/.*|[^/]*)"),
-    (1, r"zelmar/metaobj/.*"),
+    (1, r"zelmar/(metaobj|internal/text)/.*"),
     (2, r"zelmar/callspec/.*"),
     (3, r"zelmar/autocli/formatters/.*"),
     (4, r"zelmar/autocli/(NamespaceNode|Namespace|CommandSpec|Command|CommandInput|CommandOutput"

@@ -1,7 +1,11 @@
 #include <zelmar/autocli/CommandList.h>
 #include <zelmar/autocli/InternalPlugin.h>
 #include <zelmar/autocli/formatters/CommandHelpFormatter.h>
+#include <zelmar/autocli/formatters/JsonFormatter.h>
+#include <zelmar/autocli/formatters/PythonFormatter.h>
+#include <zelmar/autocli/formatters/SimpleFormatter.h>
 #include <zelmar/autocli/formatters/TableFormatter.h>
+#include <zelmar/autocli/formatters/XmlFormatter.h>
 
 #include <algorithm>
 
@@ -15,6 +19,10 @@ std::shared_ptr<InternalPlugin> InternalPlugin::New() {
 
 void InternalPlugin::Initialize() {
     _formatters.push_back(std::make_shared<TableFormatter>());
+    _formatters.push_back(std::make_shared<SimpleFormatter>());
+    _formatters.push_back(std::make_shared<XmlFormatter>());
+    _formatters.push_back(std::make_shared<PythonFormatter>());
+    _formatters.push_back(std::make_shared<JsonFormatter>());
     _formatters.push_back(std::make_shared<CommandHelpFormatter>());
 }
 

@@ -34,6 +34,13 @@ MetaList::MetaList(MetaType type, std::shared_ptr<MetaStruct> structure, Factory
     }
 }
 
+MetaList::~MetaList() {
+    for (auto& object : _objects) {
+        Release(std::move(object));
+    }
+    Release(std::move(_listStructure));
+}
+
 std::shared_ptr<MetaList> MetaList::New(MetaType type) {
     if (type == MetaType::Struct || type == MetaType::List) {
         throw ZelmarException("Integer, boolean or string type expected for list.");

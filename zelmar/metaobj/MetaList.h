@@ -15,6 +15,7 @@ namespace MetaObj {
 class ZELMAR_EXPORT MetaList final : public MetaObject {
 public:
     MetaList(MetaType type, std::shared_ptr<MetaStruct> structure, FactoryFlag flag);
+    ~MetaList();
 
     /// A list of scalars. Throws `ZelmarException` for another kind: "Integer, boolean or string
     /// type expected for list."

@@ -45,6 +45,10 @@ protected:
     // Not virtual: a value dies through the shared pointer that its factory made.
     ~MetaObject() = default;
 
+    // Lets go of a value within another one that dies. Values may be nested deeper than the stack
+    // of a thread reaches, so what dies in turn waits until this has died.
+    static void Release(std::shared_ptr<MetaObject>&& value);
+
 private:
     const MetaType _type;
 };

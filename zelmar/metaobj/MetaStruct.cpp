@@ -50,6 +50,13 @@ MetaStruct::MetaStruct(const std::shared_ptr<MetaStruct>& definition, FactoryFla
     definition->LockStructure();
 }
 
+MetaStruct::~MetaStruct() {
+    for (auto& [name, field] : _fields) {
+        Release(std::move(field.value));
+    }
+    Release(std::move(_structureDefinition));
+}
+
 std::shared_ptr<MetaStruct> MetaStruct::New(const std::string& typeName) {
     return New(std::string(typeName));
 }

@@ -46,6 +46,7 @@ public:
 
     MetaStruct(std::string&& typeName, FactoryFlag flag);
     MetaStruct(const std::shared_ptr<MetaStruct>& definition, FactoryFlag flag);
+    ~MetaStruct();
 
     /// A struct of that type name, without a definition. Throws `ZelmarException`:
     /// "Invalid name specified for MetaStruct: <name>".

@@ -1,0 +1,96 @@
+#include <zelmar/autocli/formatters/JsonFormatter.h>
+#include <zelmar/internal/text/Escape.h>
+#include <zelmar/internal/text/ValueWalk.h>
+
+namespace AutoCli {
+
+namespace {
+
+constexpr EscapeTable MakeEscapes() {
+    constexpr std::string_view digits = "0123456789abcdef";
+    EscapeTable escapes;
+    for (unsigned byte = 0; byte < 0x100; ++byte) {
+        if (byte < 0x20 || byte >= 0x7F) {
+            const char code[] = {'\\', 'u', '0', '0', digits[byte >> 4], digits[byte & 0xF]};
+            escapes.Set(static_cast<unsigned char>(byte), {code, sizeof code});
+        }
+    }
+    escapes.Set('"', "\\\"");
+    escapes.Set('\\', "\\\\");
+    escapes.Set('/', "\\/");
+    escapes.Set('\b', "\\b");
+    escapes.Set('\t', "\\t");
+    escapes.Set('\n', "\\n");
+    escapes.Set('\f', "\\f");
+    escapes.Set('\r', "\\r");
+    return escapes;
+}
+
+constexpr EscapeTable escapes = MakeEscapes();
+
+class JsonWriter : public ValueWriter {
+public:
+    static constexpr int fieldDepth = 2;
+    static constexpr int itemDepth = 3;
+
+    using ValueWriter::ValueWriter;
+
+    void Bool(bool value, int /*level*/) { _text.Append(value ? "true" : "false"); }
+    void Int(long value, int /*level*/) { _text.Append(value); }
+    void String(const std::string& value, int /*level*/) {
+        _text.Append("\"");
+        Escape(value, escapes, [this](std::string_view piece) { _text.Append(piece); });
+        _text.Append("\"");
+    }
+
+    void OpenStruct(const MetaObj::MetaStruct& /*value*/, int level) { OpenBracket("{", level); }
+    bool OpenField(const AllFields& field, int level) {
+        _text.AppendIndent(level);
+        _text.Append("   \"");
+        _text.Append(field.Name());
+        _text.Append("\": ");
+        return true;
+    }
+    void CloseField(bool isLast, int /*level*/) { WriteLine(isLast ? "" : ","); }
+    void CloseStruct(int level) { CloseBracket("}", level); }
+
+    bool OpenList(const MetaObj::MetaList& /*value*/, int level) {
+        OpenBracket("[", level);
+        return true;
+    }
+    void OpenItem(int level) { _text.AppendIndent(level); }
+    void CloseItem(bool isLast) { WriteLine(isLast ? "" : ", "); }
+    void CloseList(int level) { CloseBracket("]", level); }
+
+private:
+    void OpenBracket(std::string_view bracket, int level) {
+        _text.EndLine();
+        _text.AppendIndent(level);
+        WriteLine(bracket);
+    }
+    void CloseBracket(std::string_view bracket, int level) {
+        _text.AppendIndent(level);
+        _text.Append(bracket);
+    }
+};
+
+}  // namespace
+
+JsonFormatter::JsonFormatter() : Formatter("json") {
+    _description = "Print the output as JSON.";
+}
+
+bool JsonFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
+                           FormatParameters& /*parameters*/, DisplayContext& /*context*/,
+                           std::ostream& stream) {
+    Format(output->GetRootObject(), stream, -1);
+    stream << std::endl;
+    return true;
+}
+
+void JsonFormatter::Format(const std::shared_ptr<MetaObj::MetaObject>& value, std::ostream& stream,
+                           int level) const {
+    WriteValue<JsonWriter>(stream, value.get(), level);
+}
+
+}  // namespace AutoCli

@@ -1,0 +1,44 @@
+#include <zelmar/internal/text/TextWriter.h>
+
+#include <algorithm>
+#include <charconv>
+#include <limits>
+#include <ostream>
+
+void TextWriter::Append(long number) {
+    std::array<char, std::numeric_limits<long>::digits10 + 2> digits;  // and the sign
+    const auto end = std::to_chars(digits.data(), digits.data() + digits.size(), number).ptr;
+    Append(std::string_view(digits.data(), static_cast<size_t>(end - digits.data())));
+}
+
+void TextWriter::AppendBlanks(size_t count) {
+    while (count > 0) {
+        if (_used == _buffer.size()) {
+            Write();
+        }
+        const size_t piece = std::min(count, _buffer.size() - _used);
+        std::fill_n(_buffer.data() + _used, piece, ' ');
+        _used += piece;
+        count -= piece;
+    }
+}
+
+void TextWriter::EndLine() {
+    Append("\n");
+    Write();
+    _out.flush();
+}
+
+void TextWriter::Write() {
+    _out.write(_buffer.data(), static_cast<std::streamsize>(_used));
+    _used = 0;
+}
+
+void TextWriter::AppendPieces(std::string_view text) {
+    Write();
+    if (text.size() <= _buffer.size()) {
+        Append(text);
+    } else {
+        _out.write(text.data(), static_cast<std::streamsize>(text.size()));
+    }
+}

@@ -32,6 +32,7 @@ struct Contender {
     std::string name;
     std::function<void()> run;
     std::string target = {};  ///< what ours/it should be, in words; printed beside what it is
+    double times = 1;         ///< how often a run does the work; shown is the time of one
 };
 
 /// Makes the compiler believe that somebody looks at the value.
@@ -66,14 +67,13 @@ inline std::string TimeText(double seconds) {
 }
 
 /// Runs the contenders in turn, once to warm up and `rounds` times that count, and prints the
-/// result. The first is ours. A contender that does its work `times` times in one run is shown by
-/// the time of one. Returns the median time of one for each.
-inline std::vector<double> Compare(const std::string& title, int rounds,
-                                   const std::vector<Contender>& contenders, double times = 1) {
+/// result. The first is ours.
+inline void Compare(const std::string& title, int rounds,
+                    const std::vector<Contender>& contenders) {
     std::vector<std::vector<double>> seconds(contenders.size());
     for (int round = -1; round < rounds; ++round) {
         for (size_t i = 0; i < contenders.size(); ++i) {
-            const double taken = Seconds(contenders[i].run) / times;
+            const double taken = Seconds(contenders[i].run) / contenders[i].times;
             if (round >= 0) {
                 seconds[i].push_back(taken);
             }
@@ -81,10 +81,9 @@ inline std::vector<double> Compare(const std::string& title, int rounds,
     }
     std::printf("%-50s %10s %10s\n", title.c_str(), "median",
                 contenders.size() > 1 ? "ours/it" : "");
-    std::vector<double> medians;
     for (size_t i = 0; i < contenders.size(); ++i) {
-        medians.push_back(Median(seconds[i]));
-        std::printf("  %-48s %10s", contenders[i].name.c_str(), TimeText(medians[i]).c_str());
+        std::printf("  %-48s %10s", contenders[i].name.c_str(),
+                    TimeText(Median(seconds[i])).c_str());
         if (i > 0) {
             std::vector<double> ratios;
             std::ranges::transform(seconds[0], seconds[i], std::back_inserter(ratios),
@@ -95,7 +94,6 @@ inline std::vector<double> Compare(const std::string& title, int rounds,
     }
     std::printf("\n");
     std::fflush(stdout);
-    return medians;
 }
 
 struct ProgramCall {

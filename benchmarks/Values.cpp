@@ -1,0 +1,74 @@
+// Building a list of structs: what one struct of six fields costs, in time and in bytes.
+
+#include <malloc.h>
+
+#include <iostream>
+
+#include "Paired.h"
+#include "Rows.h"
+
+namespace {
+
+using List = std::shared_ptr<MetaObj::MetaList>;
+
+std::vector<Rows::Texts> MakeTexts(long count) {
+    std::vector<Rows::Texts> texts;
+    for (long row = 0; row < count; ++row) {
+        texts.emplace_back(row);
+    }
+    return texts;
+}
+
+List Build(const std::vector<Rows::Texts>& texts) {
+    auto list = MetaObj::MetaList::New(MetaObj::MetaType::Struct, Rows::Definition());
+    for (size_t row = 0; row < texts.size(); ++row) {
+        Rows::Add(*list, static_cast<long>(row), texts[row]);
+    }
+    return list;
+}
+
+// The same values in plain variables.
+struct Plain {
+    std::string device;
+    std::string path;
+    bool readonly;
+    std::string type;
+    long size;
+    long used;
+};
+
+void BuildPlain(const std::vector<Rows::Texts>& texts) {
+    std::vector<Plain> rows;
+    for (const auto& [device, path, type] : texts) {
+        const auto row = static_cast<long>(rows.size());
+        rows.push_back({device, path, row % 2 == 0, type, 4096 * row, 1000 + row});
+    }
+    Paired::Keep(rows);
+}
+
+size_t UsedBytes() {
+    const auto heap = mallinfo2();
+    return heap.uordblks + heap.hblkhd;
+}
+
+}  // namespace
+
+int main() {
+    const auto texts = MakeTexts(100'000);
+    const size_t before = UsedBytes();
+    const List list = Build(texts);
+    std::cout << "values: " << (UsedBytes() - before) / texts.size()
+              << " bytes for a struct of six fields, its values included\n"
+              << std::endl;
+    Paired::Compare("values: one struct of 100,000", 20,
+                    {{"MetaStruct of six fields", [&] { Paired::Keep(Build(texts)); }, "", 1e5},
+                     {"plain struct", [&] { BuildPlain(texts); }, "", 1e5}});
+
+    std::vector<Paired::Contender> sizes;
+    for (const int count : {1'000, 10'000, 100'000, 1'000'000}) {
+        sizes.push_back({"of " + std::to_string(count) + " rows",
+                         [texts = MakeTexts(count)] { Paired::Keep(Build(texts)); }, "about 1",
+                         1.0 * count});
+    }
+    Paired::Compare("values: one row", 5, sizes);
+}

@@ -5,8 +5,10 @@
 #include <cerrno>
 #include <climits>
 #include <cstdio>
+#include <cstring>
 #include <optional>
 #include <string_view>
+#include <utility>
 
 namespace {
 
@@ -127,7 +129,8 @@ bool Format(const std::string& format, const ArgumentKind& kind, Value value, si
     if (std::snprintf(buffer.data(), buffer.size(), safe->c_str(), value) < 0) {
         return false;
     }
-    result = buffer.data();
+    buffer.resize(std::strlen(buffer.data()));
+    result = std::move(buffer);
     return true;
 }
 

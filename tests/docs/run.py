@@ -54,18 +54,19 @@ class Session:
         self.script += f"install -D -m {mode} '{copy}' '{name}'\n"
 
     def add_commands(self, body, line):
+        commands = []
         for number, text in enumerate(body.splitlines(keepends=True), line + 1):
             if text.startswith("$ "):
-                self.commands.append([number, text[2:], ""])
-            elif text.startswith("> ") and self.commands and not self.commands[-1][2]:
-                self.commands[-1][1] += text[2:]
-            elif not self.commands or self.commands[-1][0] <= line:
+                commands.append([number, text[2:], ""])
+            elif not commands:
                 raise SystemExit(f"{self.page}:{number}: output in front of the first command")
+            elif text.startswith("> ") and not commands[-1][2]:
+                commands[-1][1] += text[2:]
             else:
-                self.commands[-1][2] += text
-        for number, command, _ in self.commands:
-            if number > line:
-                self.script += f"{{ {command}}} >'{self.folder}/out-{number}' 2>&1\n"
+                commands[-1][2] += text
+        for number, command, _ in commands:
+            self.script += f"{{ {command}}} >'{self.folder}/out-{number}' 2>&1\n"
+        self.commands += commands
 
     def run(self, build):
         work = self.folder / "work"

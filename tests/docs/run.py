@@ -5,8 +5,9 @@
 
 With --update the pages get what their commands printed, to be read before it is kept.
 
-A page is one shell session in an empty folder, with the tool of BUILD on the PATH and with
-`examples`, a link to the examples of this repository. Its fenced blocks are taken in order:
+A page is one shell session in an empty folder, with the tool of BUILD on the PATH, the library
+installed where pkg-config and CMake find it, and two links: `examples` to the examples of this
+repository and `plugins` to where its plugins are built. Its fenced blocks are taken in order:
 
     ```xml file=hello.xml         is written to this file; any language will do
     ```sh file=hello.sh mode=755  the same, with these permissions
@@ -72,6 +73,7 @@ class Session:
         work = self.folder / "work"
         work.mkdir()
         (work / "examples").symlink_to(ROOT / "examples")
+        (work / "plugins").symlink_to(build / "plugins")
         environment = dict(
             os.environ,
             PATH=f"{build / 'bin'}:{os.environ['PATH']}",
@@ -123,6 +125,14 @@ def check(page, build, update):
     return [session.complaint(*difference) for difference in differences]
 
 
+def install(build, prefix):
+    """Installs the build where the pages' commands find it."""
+    subprocess.run(["cmake", "--install", build, "--prefix", prefix],
+                   stdout=subprocess.DEVNULL, check=True)
+    os.environ["CMAKE_PREFIX_PATH"] = prefix
+    os.environ["PKG_CONFIG_PATH"] = ":".join(map(str, pathlib.Path(prefix).rglob("pkgconfig")))
+
+
 def main():
     parser = argparse.ArgumentParser()
     parser.add_argument("--build", type=pathlib.Path, required=True)
@@ -130,8 +140,10 @@ def main():
     parser.add_argument("pages", type=pathlib.Path, nargs="+")
     arguments = parser.parse_args()
     build = arguments.build.resolve()
-    complaints = [complaint for page in arguments.pages
-                  for complaint in check(page, build, arguments.update)]
+    with tempfile.TemporaryDirectory() as prefix:
+        install(build, prefix)
+        complaints = [complaint for page in arguments.pages
+                      for complaint in check(page, build, arguments.update)]
     sys.exit("\n".join(complaints) or 0)
 
 

@@ -129,7 +129,7 @@ std::shared_ptr<OutputSpec> ProcessList::GetOutputSpecInternal() {
 
 void ProcessList::ExecuteInternal(const std::shared_ptr<Input>& input,
                                   const std::shared_ptr<Output>& output) {
-    // The name of an absent parameter reads as empty, and the empty expression is found in all.
+    // An absent parameter reads as empty, and the empty expression is found in all.
     const std::string& expression = input->GetParameter("name");
     const Pattern pattern(expression);
     if (const std::string complaint = pattern.Complaint(); !complaint.empty()) {

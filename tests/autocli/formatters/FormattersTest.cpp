@@ -6,6 +6,7 @@
 #include <zelmar/autocli/formatters/PythonFormatter.h>
 #include <zelmar/autocli/formatters/SimpleFormatter.h>
 #include <zelmar/autocli/formatters/XmlFormatter.h>
+#include <zelmar/internal/BlockOutput.h>
 
 #include <gtest/gtest.h>
 
@@ -80,7 +81,7 @@ TEST(Formatters, SampleValuesGiveTheGoldenTexts) {
     }
 }
 
-// Flushing line by line is what lets a reader at the other end of a pipe follow.
+// Flushing line by line lets a reader at the other end of a pipe follow, unless blocks are wanted.
 TEST(Formatters, EveryLineEndIsAFlush) {
     struct Counter : std::stringbuf {
         int sync() override { return ++flushes, 0; }
@@ -91,6 +92,13 @@ TEST(Formatters, EveryLineEndIsAFlush) {
         std::ostream stream(&counter);
         Write(*formatter, SampleValues()[10].second, stream);
         EXPECT_EQ(counter.flushes, std::ranges::count(counter.str(), '\n')) << formatter->GetName();
+
+        counter.flushes = 0;
+        {
+            const BlockOutput blocks(stream);
+            Write(*formatter, SampleValues()[10].second, stream);
+        }
+        EXPECT_EQ(counter.flushes, 1) << formatter->GetName();
     }
 }
 

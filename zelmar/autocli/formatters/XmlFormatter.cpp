@@ -139,6 +139,7 @@ void WriteHead(std::ostream& stream, const FormatParameters& parameters) {
     text.EndLine();
     text.Append("   <root>");
     text.EndLine();
+    text.Finish();
 }
 
 }  // namespace

@@ -1,9 +1,11 @@
+#include <zelmar/internal/BlockOutput.h>
 #include <zelmar/internal/text/TextWriter.h>
 
-#include <algorithm>
 #include <charconv>
 #include <limits>
-#include <ostream>
+
+TextWriter::TextWriter(std::ostream& out)
+    : _out(out), _linesGather(dynamic_cast<BlockOutput*>(out.rdbuf()) != nullptr) {}
 
 void TextWriter::Append(long number) {
     std::array<char, std::numeric_limits<long>::digits10 + 2> digits;  // and the sign
@@ -11,27 +13,11 @@ void TextWriter::Append(long number) {
     Append(std::string_view(digits.data(), static_cast<size_t>(end - digits.data())));
 }
 
-void TextWriter::AppendBlanks(size_t count) {
-    while (count > 0) {
-        if (_used == _buffer.size()) {
-            Write();
-        }
-        const size_t piece = std::min(count, _buffer.size() - _used);
-        std::fill_n(_buffer.data() + _used, piece, ' ');
-        _used += piece;
-        count -= piece;
-    }
-}
-
-void TextWriter::EndLine() {
-    Append("\n");
+void TextWriter::Finish() {
     Write();
-    _out.flush();
-}
-
-void TextWriter::Write() {
-    _out.write(_buffer.data(), static_cast<std::streamsize>(_used));
-    _used = 0;
+    if (_flushWanted) {
+        _out.flush();
+    }
 }
 
 void TextWriter::AppendPieces(std::string_view text) {
@@ -41,4 +27,25 @@ void TextWriter::AppendPieces(std::string_view text) {
     } else {
         _out.write(text.data(), static_cast<std::streamsize>(text.size()));
     }
+}
+
+void TextWriter::AppendManyBlanks(size_t count) {
+    while (count > 0) {
+        if (_used == _buffer.size()) {
+            Write();
+        }
+        const size_t piece = std::min(count, _buffer.size() - _used);
+        AppendBlanks(piece);
+        count -= piece;
+    }
+}
+
+void TextWriter::Write() {
+    _out.write(_buffer.data(), static_cast<std::streamsize>(_used));
+    _used = 0;
+}
+
+void TextWriter::WriteLine() {
+    Write();
+    _out.flush();
 }

@@ -188,5 +188,5 @@ void WriteValue(std::ostream& out, const MetaObj::MetaObject* value, int level,
     TextWriter text(out);
     Writer writer(text, std::forward<Arguments>(arguments)...);
     ValueWalk<Writer>(writer).Walk(value, level);
-    text.Write();
+    text.Finish();
 }

@@ -1,0 +1,135 @@
+#!/usr/bin/env python3
+"""Reads the golden texts back with the readers that users have, to the values they were made from.
+
+Some values give texts that a reader refuses or takes for something else; those are named here, and
+docs/formats.md tells what a script author must know of them.
+"""
+
+import ast
+import json
+import pathlib
+import re
+import subprocess
+import unittest
+import xml.etree.ElementTree
+
+GOLDEN = pathlib.Path(__file__).resolve().parent / "golden"
+EVERY_BYTE = bytes(range(256))
+DISKS = [{"Name": "sda", "Removable": False, "Size": 512},
+         {"Name": "sdb1", "Removable": True, "Size": 16}]
+
+
+def host(name):
+    return {"Controller": {"Disks": DISKS, "Ports": [1, -2]}, "Name": name, "Up": True}
+
+
+VALUES = {
+    "bool": True,
+    "int": -2**63,
+    "empty string": "",
+    "every byte": EVERY_BYTE.decode("latin-1"),
+    "empty struct": {},
+    "empty list": [],
+    "empty list of structs": [],
+    "list of integers": [-2**63, -1, 0, 2**63 - 1],
+    "list of structs": DISKS,
+    "nested struct": host("alpha"),
+    "nested list": [host("alpha"), host("beta")],
+    "texts": [{"empty": "",
+               "lines": "one\ntwo\r\n\tthree\n",
+               "markup": "<a href=\"x\">100% 'R&D'</a> &lt; // \\",
+               "quotes": "\"ends in a quote\"",
+               "utf8": "Z\u00fcrich \u20ac \U0001f600"}],
+}
+
+
+def documents(formatter):
+    """The texts, as bytes, by the names of the values."""
+    pieces = re.split(rb"^=== (.*)\n", (GOLDEN / f"{formatter}.txt").read_bytes(), flags=re.M)
+    return {name.decode(): text for name, text in zip(pieces[1::2], pieces[2::2])}
+
+
+def with_texts(value, change):
+    """The value, with each text in it changed."""
+    if isinstance(value, list):
+        return [with_texts(item, change) for item in value]
+    if isinstance(value, dict):
+        return {name: with_texts(field, change) for name, field in value.items()}
+    return change(value) if isinstance(value, str) else value
+
+
+def bytes_as_characters(text):
+    return text if text == VALUES["every byte"] else text.encode().decode("latin-1")
+
+
+def from_xml(element):
+    if element.tag == "structure":
+        return {field.get("name"): from_xml(field[0]) for field in element}
+    if element.tag == "list":
+        return [from_xml(item) for item in element]
+    text = element.text or ""
+    return {"integer": int, "boolean": "true".__eq__, "string": str}[element.tag](text)
+
+
+def run(*command, text=b""):
+    return subprocess.run(command, input=text, capture_output=True, check=False)
+
+
+READERS = {
+    "json": json.loads,
+    "python": lambda text: ast.literal_eval(text.decode()),
+    "xml": xml.etree.ElementTree.fromstring,
+}
+
+# Names are not escaped, Python source holds no zero byte, and XML hardly any control character.
+REFUSED = [("json", "names"), ("python", "names"), ("python", "every byte"), ("xml", "names"),
+           ("xml", "every byte")]
+
+
+class ReadBack(unittest.TestCase):
+    def each(self, formatter, leave_out=()):
+        for name, value in VALUES.items():
+            if name not in leave_out:
+                yield documents(formatter)[name], value
+
+    def test_json(self):
+        for text, value in self.each("json"):
+            self.assertEqual(json.loads(text), with_texts(value, bytes_as_characters))
+
+    def test_jq(self):  # its numbers have 53 bits
+        for text, value in self.each("json", leave_out=("int", "list of integers")):
+            read = json.loads(run("jq", ".", text=text).stdout)
+            self.assertEqual(read, with_texts(value, bytes_as_characters))
+
+    def test_python(self):
+        for text, value in self.each("python", leave_out=("every byte", "texts")):
+            self.assertEqual(ast.literal_eval(text.decode()), value)
+
+    def test_python_cannot_hold_a_backslash_at_the_end(self):
+        text = documents("python")["texts"].decode()
+        self.assertRaises(SyntaxError, ast.literal_eval, text)
+        # Without it, all but the carriage return stays what it is.
+        expected = with_texts(VALUES["texts"], lambda t: t.removesuffix("\\").replace("\r", "\n"))
+        self.assertEqual(ast.literal_eval(text.replace('\\"""', '"""', 1)), expected)
+
+    def test_xml(self):
+        for text, value in self.each("xml", leave_out=("every byte",)):
+            self.assertEqual(run("xmllint", "--noout", "-", text=text).stderr, b"")
+            read = from_xml(xml.etree.ElementTree.fromstring(text).find("root")[0])
+            # Every reader of XML takes the end of a line, in whatever form, for a line feed.
+            self.assertEqual(read, with_texts(value, lambda t: t.replace("\r\n", "\n")))
+
+    def test_xpath(self):
+        path = "string(//structure[@typeName='Host']/field[@name='Name']/string)"
+        text = documents("xml")["nested struct"]
+        self.assertEqual(run("xmllint", "--xpath", path, "-", text=text).stdout, b"alpha\n")
+
+    def test_what_is_refused(self):
+        for formatter, name in REFUSED:
+            with self.subTest(formatter=formatter, name=name):
+                with self.assertRaises((ValueError, SyntaxError)):
+                    READERS[formatter](documents(formatter)[name])
+
+
+if __name__ == "__main__":
+    unittest.main()

@@ -1,7 +1,8 @@
 #pragma once
 
-// What all benchmarks share. The machine is noisy, and speed drifts while a benchmark runs: so the
-// contenders take turns, A B C A B C, and each is compared with the first within the same turn.
+// What all benchmarks share. The machine is noisy, and its speed drifts while a benchmark runs: so
+// the contenders take turns, A B C, C B A, A B C, and each is compared with the first of the same
+// turn. The way back is for the caches, which nobody shall always find cold.
 //
 //     Paired::Compare("table, 100,000 rows", 11,
 //                     {{"ours", PrintTable}, {"floor", PrintFloor, "at most 2"}});
@@ -33,6 +34,7 @@ struct Contender {
     std::function<void()> run;
     std::string target = {};  ///< what ours/it should be, in words; printed beside what it is
     double times = 1;         ///< how often a run does the work; shown is the time of one
+    std::function<void()> clear = {};  ///< what is to be done behind a run, off the clock
 };
 
 /// Makes the compiler believe that somebody looks at the value.
@@ -72,8 +74,12 @@ inline void Compare(const std::string& title, int rounds,
                     const std::vector<Contender>& contenders) {
     std::vector<std::vector<double>> seconds(contenders.size());
     for (int round = -1; round < rounds; ++round) {
-        for (size_t i = 0; i < contenders.size(); ++i) {
+        for (size_t place = 0; place < contenders.size(); ++place) {
+            const size_t i = round % 2 == 0 ? place : contenders.size() - 1 - place;
             const double taken = Seconds(contenders[i].run) / contenders[i].times;
+            if (contenders[i].clear) {
+                contenders[i].clear();
+            }
             if (round >= 0) {
                 seconds[i].push_back(taken);
             }

@@ -160,7 +160,8 @@ int main() {
     const std::string folder = std::filesystem::temp_directory_path() / "zelmar-table-benchmark-";
     const std::string ours = folder + "ours", floor = folder + "floor", peer = folder + "peer",
                       cells = folder + "cells";
-    MeasureMemory(Rows::Make(1000), ours);
+    PrintOurs(Rows::Make(1), ours);  // what is loaded and kept at the first call is no growth
+    MeasureMemory(Rows::Make(1'000), ours);
     MeasureMemory(Rows::Make(10'000), ours);
     const List list = Rows::Make(100'000);
     MeasureMemory(list, ours);
@@ -172,9 +173,12 @@ int main() {
     const auto column = [&] {
         Paired::RunProgram({{"column", "-t", "-s", "\t", "-R", "4,6"}, cells, peer});
     };
-    Paired::Compare("table: 100,000 rows of six fields, to a file", 20,
-                    {{"table formatter", [&] { PrintOurs(list, ours); }},
-                     {"two passes by hand", [&] { PrintByHand(list, floor); }, "at most 2"},
+    const auto formatter = [&] { PrintOurs(list, ours); };
+    Paired::Compare("table: 100,000 rows of six fields, to a file", 60,
+                    {{"table formatter", formatter},
+                     {"two passes by hand", [&] { PrintByHand(list, floor); }, "at most 2"}});
+    Paired::Compare("table: the same, beside its peers", 10,
+                    {{"table formatter", formatter},
                      {"libsmartcols", [&] { PrintWithSmartcols(list, peer); }, "at most 0.33"},
                      {"column -t", column, "at most 0.33"}});
     for (const std::string& file : {ours, floor, peer, cells}) {

@@ -28,7 +28,7 @@ void AddEach(MetaList& list, const Values& values) {
 }  // namespace
 
 MetaList::MetaList(MetaType type, std::shared_ptr<MetaStruct> structure, FactoryFlag flag)
-    : MetaObject(MetaType::List, flag), _listStructure(std::move(structure)), _listType(type) {
+    : MetaObject(kind, flag), _listStructure(std::move(structure)), _listType(type) {
     if (_listStructure) {
         _listStructure->LockStructure();
     }

@@ -14,6 +14,8 @@ namespace MetaObj {
 /// the items. A list of lists cannot be made.
 class ZELMAR_EXPORT MetaList final : public MetaObject {
 public:
+    static constexpr MetaType kind = MetaType::List;
+
     MetaList(MetaType type, std::shared_ptr<MetaStruct> structure, FactoryFlag flag);
     ~MetaList();
 

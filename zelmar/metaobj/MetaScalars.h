@@ -10,7 +10,9 @@ namespace MetaObj {
 
 class ZELMAR_EXPORT MetaBool final : public MetaObject {
 public:
-    MetaBool(bool value, FactoryFlag flag) : MetaObject(MetaType::Bool, flag), _value(value) {}
+    static constexpr MetaType kind = MetaType::Bool;
+
+    MetaBool(bool value, FactoryFlag flag) : MetaObject(kind, flag), _value(value) {}
 
     static const std::shared_ptr<MetaBool>& New();
     static const std::shared_ptr<MetaBool>& New(bool value);
@@ -30,7 +32,9 @@ private:
 
 class ZELMAR_EXPORT MetaInt final : public MetaObject {
 public:
-    MetaInt(long value, FactoryFlag flag) : MetaObject(MetaType::Int, flag), _value(value) {}
+    static constexpr MetaType kind = MetaType::Int;
+
+    MetaInt(long value, FactoryFlag flag) : MetaObject(kind, flag), _value(value) {}
 
     /// The instance for 0.
     static const std::shared_ptr<MetaInt>& New();
@@ -51,8 +55,10 @@ private:
 /// A text is a string of bytes; no encoding is enforced but by `NewUtf8WithEscapes`.
 class ZELMAR_EXPORT MetaString final : public MetaObject {
 public:
+    static constexpr MetaType kind = MetaType::String;
+
     MetaString(std::string&& value, FactoryFlag flag)
-        : MetaObject(MetaType::String, flag), _value(std::move(value)) {}
+        : MetaObject(kind, flag), _value(std::move(value)) {}
 
     /// The instance for the empty string.
     static const std::shared_ptr<MetaString>& New();

@@ -37,16 +37,14 @@ bool IsValidFieldName(const std::string& /*name*/) {
 }
 
 MetaStruct::MetaStruct(std::string&& typeName, FactoryFlag flag)
-    : MetaObject(MetaType::Struct, flag), _typeName(std::move(typeName)) {
+    : MetaObject(kind, flag), _typeName(std::move(typeName)) {
     if (!IsValidStructName(_typeName)) {
         throw ZelmarException("Invalid name specified for MetaStruct: " + _typeName);
     }
 }
 
 MetaStruct::MetaStruct(const std::shared_ptr<MetaStruct>& definition, FactoryFlag flag)
-    : MetaObject(MetaType::Struct, flag),
-      _structureDefinition(definition),
-      _typeName(definition->_typeName) {
+    : MetaObject(kind, flag), _structureDefinition(definition), _typeName(definition->_typeName) {
     definition->LockStructure();
 }
 

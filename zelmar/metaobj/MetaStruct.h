@@ -25,6 +25,8 @@ ZELMAR_EXPORT bool IsValidFieldName(const std::string& name);
 /// right kinds, which nothing checks by itself.
 class ZELMAR_EXPORT MetaStruct final : public MetaObject {
 public:
+    static constexpr MetaType kind = MetaType::Struct;
+
     /// What a struct holds under one name. The value of a stored field is never null.
     struct ZELMAR_EXPORT Field {
         Field(std::shared_ptr<MetaObject> fieldValue, std::string fieldDocumentation)

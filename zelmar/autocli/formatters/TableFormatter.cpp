@@ -55,6 +55,38 @@ bool ShowsHeader(const FormatParameters& parameters) {
     return (shown.empty() ? parameters.GetParameter("table-header") : shown) != "false";
 }
 
+using Value = std::shared_ptr<MetaObject>;
+
+// One struct of the list, which is asked for the values of the columns in their order.
+class Row {
+public:
+    explicit Row(const Value& item)
+        : _item(item), _fields(static_cast<const MetaStruct&>(*item).GetFields()) {}
+
+    const std::string& GetTypeName() const {
+        return static_cast<const MetaStruct&>(*_item).GetTypeName();
+    }
+
+    // Null when the row lacks it. Lives until the next call.
+    const Value& ValueOf(const Column& column) {
+        if (column.isPath) {
+            return _subValue =
+                       GetSubField(std::static_pointer_cast<MetaStruct>(_item), column.name);
+        }
+        // Columns mostly stand in the order of the fields: then the next one needs no search.
+        if (_next == _fields.end() || _next->first != column.name) {
+            _next = _fields.find(column.name);
+        }
+        return _next == _fields.end() ? _subValue = nullptr : (_next++)->second.value;
+    }
+
+private:
+    const Value& _item;
+    const std::map<std::string, MetaStruct::Field>& _fields;
+    std::map<std::string, MetaStruct::Field>::const_iterator _next = _fields.begin();
+    Value _subValue;
+};
+
 // One call of the formatter: what the columns are, and how wide.
 class Table {
 public:
@@ -76,19 +108,19 @@ public:
     // False after an error that was written to the stream.
     bool Measure() {
         for (const auto& item : _list.GetObjects()) {
-            const auto row = std::dynamic_pointer_cast<MetaStruct>(item);
-            if (!row) {
+            if (!MetaCast<MetaStruct>(item.get())) {
                 _out << "Error: Unexpected type, unable to get struct from list" << std::endl;
                 return false;
             }
+            Row row(item);
             for (Column& column : _columns) {
-                const auto value = ValueOf(row, column);
+                const auto& value = row.ValueOf(column);
                 if (!value) {
                     _out << "Error: Unknown field in field list: " << column.name << std::endl;
                     return false;
                 }
                 column.width =
-                    std::max(column.width, CellText(*row, column, value).size() + columnGap);
+                    std::max(column.width, CellText(row, column, value).size() + columnGap);
             }
         }
         return true;
@@ -103,15 +135,15 @@ public:
         const bool wraps = !_columns.empty() && startColumn > 0 &&
                            startColumn + _columns.back().name.size() <= _screenWidth;
         for (const auto& item : _list.GetObjects()) {
-            const auto row = std::static_pointer_cast<MetaStruct>(item);
+            Row row(item);
             for (const Column& column : _columns) {
-                const auto value = ValueOf(row, column);
+                const auto& value = row.ValueOf(column);
                 if (wraps && column.isLast) {
                     WriteText();
                     AutoCli_FitString(static_cast<int>(startColumn), static_cast<int>(_screenWidth),
                                       value->ToString(), true, _out, false, 0, true);
                 } else {
-                    AppendCell(column, CellText(*row, column, value),
+                    AppendCell(column, CellText(row, column, value),
                                value->GetType() == MetaType::Int);
                 }
             }
@@ -120,14 +152,8 @@ public:
     }
 
 private:
-    static std::shared_ptr<MetaObject> ValueOf(const std::shared_ptr<MetaStruct>& row,
-                                               const Column& column) {
-        return column.isPath ? GetSubField(row, column.name) : row->GetField(column.name);
-    }
-
     // Lives until the next call. No string is made where the value's own text will do.
-    std::string_view CellText(const MetaStruct& row, const Column& column,
-                              const std::shared_ptr<MetaObject>& value) {
+    std::string_view CellText(const Row& row, const Column& column, const Value& value) {
         if (_hasFieldFormats) {
             return _cell = AutoCli_FormatField(row.GetTypeName(), column.name, value, _parameters);
         }
@@ -182,8 +208,9 @@ private:
     }
 
     void EndLine() {
+        _line += '\n';
         WriteText();
-        _out << std::endl;
+        _out.flush();
     }
 
     const MetaList& _list;

@@ -17,6 +17,10 @@
 #include <zelmar/autocli/OptionParser.h>
 #include <zelmar/autocli/Plugin.h>
 #include <zelmar/autocli/SharedLibraryPlugin.h>
+#include <zelmar/autocli/extension/ExtensionCommand.h>
+#include <zelmar/autocli/extension/Panic.h>
+#include <zelmar/autocli/extension/ShellCmd.h>
+#include <zelmar/autocli/extension/XmlPlugin.h>
 #include <zelmar/autocli/formatters/CliDispatcherHelpFormatter.h>
 #include <zelmar/autocli/formatters/CommandHelpFormatter.h>
 #include <zelmar/autocli/formatters/FitString.h>

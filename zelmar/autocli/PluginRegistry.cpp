@@ -3,6 +3,7 @@
 #include <zelmar/ZelmarException.h>
 #include <zelmar/autocli/Dispatcher.h>
 #include <zelmar/autocli/SharedLibraryPlugin.h>
+#include <zelmar/autocli/extension/XmlPlugin.h>
 
 #include <dirent.h>
 
@@ -29,6 +30,9 @@ bool HasEnding(std::string_view path, std::string_view ending) {
 std::shared_ptr<Plugin> PluginForFile(const std::string& path) {
     if (HasEnding(path, ".so")) {
         return SharedLibraryPlugin::New(path);
+    }
+    if (HasEnding(path, ".xml")) {
+        return XmlPlugin::New(path);
     }
     return nullptr;
 }

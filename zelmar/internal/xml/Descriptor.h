@@ -1,0 +1,37 @@
+#pragma once
+
+#include <zelmar/autocli/CommandSpec.h>
+#include <zelmar/internal/xml/XmlUtil.h>
+
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+// Readers of the parts of a <command> element of a descriptor. Elements that have no meaning at
+// their place are passed over, except where a comment says otherwise. Everything that is wrong
+// throws `ZelmarException`.
+
+namespace AutoCli {
+
+/// Only checks, and leaves the command alone: the entries are for others than the engine. An
+/// unknown element is an error.
+void ExtractMetaData(const xmlNode* node, const CommandSpec& command);
+
+void ExtractFormatParams(const xmlNode* node, CommandSpec& command);
+
+[[nodiscard]] std::shared_ptr<CallSpec::InputSpec> ExtractInputSpec(const xmlNode* node);
+void ExtractInputParam(const xmlNode* node, CallSpec::InputSpec& inputSpec);
+
+/// Of several data elements that fit the constraint's type the last one holds.
+[[nodiscard]] std::shared_ptr<CallSpec::ParameterConstraint> ExtractParamConstraint(
+    const xmlNode* node);
+
+/// Value and description of each entry, in the order of the file; one without text counts for
+/// nothing. An unknown element is an error.
+[[nodiscard]] std::vector<std::pair<std::string, std::string>> ExtractEnum(const xmlNode* node);
+
+/// Without a root object when the element holds no value. Any element stands for one.
+[[nodiscard]] std::shared_ptr<CallSpec::OutputSpec> ExtractOutputSpec(const xmlNode* node);
+
+}  // namespace AutoCli

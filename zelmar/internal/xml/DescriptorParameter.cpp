@@ -1,0 +1,223 @@
+#include <zelmar/internal/Rethrow.h>
+#include <zelmar/internal/StreamInt.h>
+#include <zelmar/internal/xml/Descriptor.h>
+
+#include <algorithm>
+
+using CallSpec::InputSpec;
+using CallSpec::ParameterConstraint;
+using CallSpec::ParameterConstraintType;
+using CallSpec::ParameterSpec;
+using CallSpec::ParameterType;
+using Zelmar::ZelmarException;
+
+namespace AutoCli {
+
+namespace {
+
+// The row of a table for the word in a `type` attribute, or null.
+template <class Row, size_t Count>
+const Row* FindRow(const Row (&rows)[Count], const std::string& type) {
+    const Row* row = std::ranges::find(rows, type, &Row::type);
+    return row == std::end(rows) ? nullptr : row;
+}
+
+struct ParameterKind {
+    std::string_view type;
+    ParameterType parameterType;
+};
+
+constexpr ParameterKind parameterKinds[] = {
+    {"string", CallSpec::ParameterTypeString},
+    {"int", CallSpec::ParameterTypeInt},
+    {"bool", CallSpec::ParameterTypeBool},
+    {"flag", CallSpec::ParameterTypeFlag},
+    {"string-list", CallSpec::ParameterTypeStringList},
+    {"int-list", CallSpec::ParameterTypeIntList},
+    {"bool-list", CallSpec::ParameterTypeBoolList},
+};
+
+// What fills a constraint from its data element tells whether there was any data.
+bool FillStringEnum(const xmlNode* node, ParameterConstraint& constraint) {
+    const auto entries = ExtractEnum(node);
+    for (const auto& [value, description] : entries) {
+        constraint.AddStringEnum(value, description);
+    }
+    return !entries.empty();
+}
+
+bool FillIntEnum(const xmlNode* node, ParameterConstraint& constraint) {
+    const auto entries = ExtractEnum(node);
+    for (const auto& [value, description] : entries) {
+        const auto number = ReadStreamInt(value);
+        if (!number) {
+            throw ZelmarException("Error parsing integer enumeration. Expected integer, but got " +
+                                  value);
+        }
+        constraint.AddIntEnum(*number);
+    }
+    return !entries.empty();
+}
+
+bool FillRegex(const xmlNode* node, ParameterConstraint& constraint) {
+    const std::string regex = XmlUtil_GetContent(node);
+    if (regex.empty()) {
+        throw ZelmarException(
+            "Error parsing regex from parameter constraint.Missing or empty 'regex' tag");
+    }
+    constraint.SetStringRegex(regex);
+    return true;
+}
+
+bool FillRange(const xmlNode* node, ParameterConstraint& constraint) {
+    const auto min = ReadStreamInt(XmlUtil_ExtractAttribute(node, "min"));
+    const auto max = ReadStreamInt(XmlUtil_ExtractAttribute(node, "max"));
+    if (!min || !max) {
+        throw ZelmarException(
+            "Error parsing 'range' parameter constraint.  Range requires both 'min' and 'max'"
+            " attributes and that both are integers.");
+    }
+    constraint.SetIntRange(*min, *max);
+    return true;
+}
+
+struct ConstraintKind {
+    std::string_view type;
+    ParameterConstraintType constraintType;
+    std::string_view dataTag;
+    bool (*fill)(const xmlNode* node, ParameterConstraint& constraint);
+};
+
+constexpr ConstraintKind constraintKinds[] = {
+    {"stringenum", CallSpec::ConstraintTypeStringEnum, "enum", FillStringEnum},
+    {"intenum", CallSpec::ConstraintTypeIntEnum, "enum", FillIntEnum},
+    {"regex", CallSpec::ConstraintTypeStringRegex, "regex", FillRegex},
+    {"range", CallSpec::ConstraintTypeIntRange, "range", FillRange},
+};
+
+bool IsTruthWord(const std::string& word) {
+    return word == "true" || word == "false";
+}
+
+// The attributes of a <parameter> and its description, as they stand in the file.
+struct ParameterText {
+    std::string name;
+    std::string type;
+    std::string required;
+    std::string secret;
+    std::string shortName;
+    std::string description;
+};
+
+ParameterText ReadParameterText(const xmlNode* node) {
+    return {XmlUtil_ExtractAttribute(node, "name"),
+            XmlUtil_ExtractAttribute(node, "type"),
+            XmlUtil_ExtractAttribute(node, "required"),
+            XmlUtil_ExtractAttribute(node, "secret"),
+            XmlUtil_ExtractAttribute(node, "shortname"),
+            XmlUtil_GetContentForChildByTag(node, "description")};
+}
+
+ParameterType CheckParameterText(const ParameterText& text) {
+    if (text.name.empty()) {
+        throw ZelmarException(
+            "Unable to parse Input Parameter.  Missing required attribute: 'name'");
+    }
+    const ParameterKind* kind = FindRow(parameterKinds, text.type);
+    if (!kind) {
+        throw ZelmarException(
+            "Unable to parse Input Parameter " + text.name +
+            ". Missing or invalid required attribute: 'type'.  Must be one of [string,"
+            " string-list, bool, bool-list, int, int-list]");
+    }
+    if (!IsTruthWord(text.required)) {
+        throw ZelmarException("Unable to parse Input Paramter " + text.name +
+                              ". Missing or invalid 'required', must be one of ['true', 'false']");
+    }
+    if (text.description.empty()) {
+        throw ZelmarException("Unable to parse Input Paramter " + text.name +
+                              ". Missing command description");
+    }
+    if (!text.secret.empty() && !IsTruthWord(text.secret)) {
+        throw ZelmarException("Unable to parse Input Paramter " + text.name +
+                              ". Invalid 'secret', must be one of ['true', 'false']");
+    }
+    if (text.secret == "true" && kind->parameterType != CallSpec::ParameterTypeString) {
+        throw ZelmarException("Unable to parse Input Paramter " + text.name + ". Invalid type " +
+                              text.type + " for secret, must be 'string'");
+    }
+    return kind->parameterType;
+}
+
+}  // namespace
+
+void ExtractInputParam(const xmlNode* node, InputSpec& inputSpec) {
+    const ParameterText text = ReadParameterText(node);
+    auto parameter = ParameterSpec::New(text.name, CheckParameterText(text));
+    if (!text.shortName.empty()) {
+        parameter->SetShortName(text.shortName);
+    }
+    parameter->SetDescription(text.description);
+    parameter->SetRequired(text.required == "true");
+    if (text.secret == "true") {
+        parameter->SetSecret(true);
+    }
+    XmlUtil_ForEachChild(node, "constraint", [&parameter](const xmlNode* constraint) {
+        WithContext("Unable to build parameter constraint for parameter " + parameter->GetName() +
+                        ".  Error was: ",
+                    [&] { parameter->SetConstraint(ExtractParamConstraint(constraint)); });
+    });
+    inputSpec.AddParameter(parameter);
+}
+
+std::shared_ptr<ParameterConstraint> ExtractParamConstraint(const xmlNode* node) {
+    const std::string type = XmlUtil_ExtractAttribute(node, "type");
+    const ConstraintKind* kind = FindRow(constraintKinds, type);
+    if (!kind) {
+        throw ZelmarException(
+            "Missing or invalid constraint 'type', must be one of [stringenum, intenum, regex,"
+            " range] got '" +
+            type + "'");
+    }
+    std::shared_ptr<ParameterConstraint> constraint;
+    bool hasData = false;
+    XmlUtil_ForEachChild(node, kind->dataTag, [&](const xmlNode* data) {
+        constraint = ParameterConstraint::New(kind->constraintType);
+        hasData = kind->fill(data, *constraint) || hasData;
+    });
+    if (!hasData) {
+        throw ZelmarException(
+            "Error parsing parameter constraint.  There was no data included inside the"
+            " <constraint> tag for the given constraint type");
+    }
+    return constraint;
+}
+
+std::vector<std::pair<std::string, std::string>> ExtractEnum(const xmlNode* node) {
+    std::vector<std::pair<std::string, std::string>> entries;
+    XmlUtil_ForEachChild(node, [&entries](const xmlNode* child) {
+        if (!XmlUtil_IsTagged(child)) {
+            return;
+        }
+        const std::string_view tag = XmlUtil_GetName(child);
+        if (tag != "enum-value") {
+            throw ZelmarException(
+                "Found unexpected tag while building an enum.  Unexpected tag was: " +
+                std::string(tag));
+        }
+        const std::string value = XmlUtil_ExtractAttribute(child, "value");
+        XmlUtil_ForEachChild(child, [&](const xmlNode* text) {
+            if (!text->content) {
+                return;
+            }
+            if (value.empty()) {
+                throw ZelmarException(
+                    "Error parsing 'enum-value', missing required attribute 'value'");
+            }
+            entries.emplace_back(value, reinterpret_cast<const char*>(text->content));
+        });
+    });
+    return entries;
+}
+
+}  // namespace AutoCli

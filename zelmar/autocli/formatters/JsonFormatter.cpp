@@ -36,7 +36,7 @@ public:
     using ValueWriter::ValueWriter;
 
     void Bool(bool value, int /*level*/) { _text.Append(value ? "true" : "false"); }
-    void Int(long value, int /*level*/) { _text.Append(value); }
+    void Int(long value, int /*level*/) { _text.AppendNumber(value); }
     void String(const std::string& value, int /*level*/) {
         _text.Append("\"");
         Escape(value, escapes, [this](std::string_view piece) { _text.Append(piece); });
@@ -46,9 +46,7 @@ public:
     void OpenStruct(const MetaObj::MetaStruct& /*value*/, int level) { OpenBracket("{", level); }
     bool OpenField(const AllFields& field, int level) {
         _text.AppendIndent(level);
-        _text.Append("   \"");
-        _text.Append(field.Name());
-        _text.Append("\": ");
+        _text.Append("   \"", field.Name(), "\": ");
         return true;
     }
     void CloseField(bool isLast, int /*level*/) { WriteLine(isLast ? "" : ","); }

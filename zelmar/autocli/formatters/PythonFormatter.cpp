@@ -24,7 +24,7 @@ public:
     using ValueWriter::ValueWriter;
 
     void Bool(bool value, int /*level*/) { _text.Append(value ? "True" : "False"); }
-    void Int(long value, int /*level*/) { _text.Append(value); }
+    void Int(long value, int /*level*/) { _text.AppendNumber(value); }
     void String(const std::string& value, int /*level*/) {
         _text.Append(R"(""")");
         Escape(value, escapes, [this](std::string_view piece) { _text.Append(piece); });
@@ -33,9 +33,7 @@ public:
 
     void OpenStruct(const MetaObj::MetaStruct& /*value*/, int /*level*/) { _text.Append("{"); }
     bool OpenField(const AllFields& field, int /*level*/) {
-        _text.Append("\"");
-        _text.Append(field.Name());
-        _text.Append("\": ");
+        _text.Append("\"", field.Name(), "\": ");
         return true;
     }
     void CloseField(bool /*isLast*/, int /*level*/) { _text.Append(", "); }

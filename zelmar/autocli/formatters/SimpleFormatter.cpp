@@ -83,7 +83,7 @@ public:
 
     void Bool(bool value, int /*level*/) { WriteLine(value ? "true" : "false"); }
     void Int(long value, int /*level*/) {
-        _text.Append(value);
+        _text.AppendNumber(value);
         _text.EndLine();
     }
     void String(const std::string& value, int /*level*/) { WriteLine(value); }
@@ -91,8 +91,7 @@ public:
     void OpenStruct(const MetaStruct& value, int level) {
         if (const std::string heading = HeadingOf(value, _parameters); heading != "<NONE>") {
             _text.AppendIndent(level);
-            _text.Append(heading);
-            WriteLine(":");
+            WriteLine(heading, ":");
         }
     }
     [[nodiscard]] ChosenFields FieldsOf(const MetaStruct& value) const {
@@ -101,14 +100,12 @@ public:
     bool OpenField(ChosenFields& field, int level) {
         const auto value = field.Value();
         if (!value) {
-            _text.Append("Error getting field ");
-            WriteLine(field.Name());
+            WriteLine("Error getting field ", field.Name());
             field.LeaveOutTheRest();
             return false;
         }
         _text.AppendIndent(level);
-        _text.Append("   ");
-        _text.Append(field.Name());
+        _text.Append("   ", field.Name());
         _text.AppendBlanks(field.Padding());
         _text.Append(": ");
         switch (value->GetType()) {
@@ -140,8 +137,7 @@ private:
     void WriteScalars(const MetaList& value) {
         std::string_view separator;
         for (const auto& item : value.GetObjects()) {
-            _text.Append(separator);
-            _text.Append(item->ToString());
+            _text.Append(separator, item->ToString());
             separator = ", ";
         }
         _text.EndLine();

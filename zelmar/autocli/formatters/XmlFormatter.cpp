@@ -50,14 +50,12 @@ public:
 
     void Bool(bool value, int level) {
         _text.AppendIndent(level);
-        _text.Append("<boolean>");
-        _text.Append(value ? "true" : "false");
-        WriteLine("</boolean>");
+        WriteLine("<boolean>", value ? "true" : "false", "</boolean>");
     }
     void Int(long value, int level) {
         _text.AppendIndent(level);
         _text.Append("<integer>");
-        _text.Append(value);
+        _text.AppendNumber(value);
         WriteLine("</integer>");
     }
     void String(const std::string& value, int level) {
@@ -118,9 +116,8 @@ void WriteHead(std::ostream& stream, const FormatParameters& parameters) {
     text.Append("<?xml version=\"1.0\"?>");
     text.EndLine();
     if (parameters.HasParameter("stylesheet")) {
-        text.Append("<?xml-stylesheet type=\"text/xsl\" href=\"");
-        text.Append(parameters.GetParameter("stylesheet"));
-        text.Append("\"?>");
+        text.Append("<?xml-stylesheet type=\"text/xsl\" href=\"",
+                    parameters.GetParameter("stylesheet"), "\"?>");
         text.EndLine();
     }
     text.Append("<output xmlns:kelvash=\"http://norvane.example/Products/TRELL/5.0/kelvash\">");

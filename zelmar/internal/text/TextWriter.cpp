@@ -7,7 +7,7 @@
 TextWriter::TextWriter(std::ostream& out)
     : _out(out), _linesGather(dynamic_cast<BlockOutput*>(out.rdbuf()) != nullptr) {}
 
-void TextWriter::Append(long number) {
+void TextWriter::AppendNumber(long number) {
     std::array<char, std::numeric_limits<long>::digits10 + 2> digits;  // and the sign
     const auto end = std::to_chars(digits.data(), digits.data() + digits.size(), number).ptr;
     Append(std::string_view(digits.data(), static_cast<size_t>(end - digits.data())));
@@ -20,12 +20,14 @@ void TextWriter::Finish() {
     }
 }
 
-void TextWriter::AppendPieces(std::string_view text) {
-    Write();
-    if (text.size() <= _buffer.size()) {
-        Append(text);
-    } else {
+void TextWriter::AppendLong(std::string_view text) {
+    if (text.size() > _buffer.size() - _used) {
+        Write();
+    }
+    if (text.size() > _buffer.size()) {
         _out.write(text.data(), static_cast<std::streamsize>(text.size()));
+    } else {
+        _used += text.copy(_buffer.data() + _used, text.size());
     }
 }
 

@@ -17,14 +17,12 @@ public:
     TextWriter(const TextWriter&) = delete;
     TextWriter& operator=(const TextWriter&) = delete;
 
-    void Append(std::string_view text) {
-        if (text.size() > _buffer.size() - _used) {
-            AppendPieces(text);
-            return;
-        }
-        _used += text.copy(_buffer.data() + _used, text.size());
+    /// Texts, one behind the other.
+    template <class... Texts>
+    void Append(const Texts&... texts) {
+        AppendAll(std::string_view(texts)...);
     }
-    void Append(long number);
+    void AppendNumber(long number);
 
     void AppendBlanks(size_t count) {
         if (count > _buffer.size() - _used) {
@@ -49,7 +47,18 @@ public:
     void Finish();
 
 private:
-    void AppendPieces(std::string_view text);
+    template <class... Views>
+    void AppendAll(Views... texts) {
+        if ((... + texts.size()) > _buffer.size() - _used) {
+            (AppendLong(texts), ...);
+            return;
+        }
+        char* end = _buffer.data() + _used;
+        ((end += texts.copy(end, texts.size())), ...);
+        _used = static_cast<size_t>(end - _buffer.data());
+    }
+
+    void AppendLong(std::string_view text);
     void AppendManyBlanks(size_t count);
     void Write();
     void WriteLine();

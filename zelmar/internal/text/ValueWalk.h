@@ -64,8 +64,9 @@ public:
     void Unknown() { WriteLine("Unknown data type"); }
 
 protected:
-    void WriteLine(std::string_view text) {
-        _text.Append(text);
+    template <class... Texts>
+    void WriteLine(const Texts&... texts) {
+        _text.Append(texts...);
         _text.EndLine();
     }
 

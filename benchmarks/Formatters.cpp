@@ -1,0 +1,98 @@
+// 100,000 structs of six fields through each formatter into a file, from values that stand ready.
+
+#include <zelmar/zelmar.h>
+
+#include <rapidjson/document.h>
+#include <rapidjson/filewritestream.h>
+#include <rapidjson/prettywriter.h>
+#include <nlohmann/json.hpp>
+
+#include <cstdio>
+#include <filesystem>
+#include <fstream>
+#include <iomanip>
+#include <memory>
+#include <sstream>
+
+#include "Memory.h"
+#include "Paired.h"
+#include "Rows.h"
+
+namespace {
+
+using List = std::shared_ptr<MetaObj::MetaList>;
+
+void Print(const List& list, const std::string& formatter, const std::string& file) {
+    static AutoCli::Dispatcher dispatcher;
+    const auto output = AutoCli::CommandOutput::New();
+    output->SetRootObject(list);
+    AutoCli::FormatParameters parameters;
+    parameters.SetFormatter(formatter);
+    AutoCli::DisplayContext context;
+    std::ofstream stream(file);
+    dispatcher.FormatOutput(output, parameters, context, stream);
+}
+
+void PrintWithNlohmann(const nlohmann::json& rows, const std::string& file) {
+    std::ofstream(file) << rows.dump(3) << '\n';
+}
+
+void PrintWithRapidJson(const rapidjson::Document& rows, const std::string& file) {
+    const std::unique_ptr<FILE, int (*)(FILE*)> stream(std::fopen(file.c_str(), "w"), std::fclose);
+    char block[65536];  // as large as the dispatcher's
+    rapidjson::FileWriteStream out(stream.get(), block, sizeof block);
+    rapidjson::PrettyWriter writer(out);
+    writer.SetIndent(' ', 3);
+    rows.Accept(writer);
+}
+
+std::string Content(const std::string& file) {
+    return (std::stringstream() << std::ifstream(file).rdbuf()).str();
+}
+
+void CompareJson(const List& list, const std::string& ours, const std::string& peer) {
+    Print(list, "json", ours);
+    const auto nlohmannRows = nlohmann::json::parse(Content(ours));
+    rapidjson::Document rapidRows;
+    rapidRows.Parse(Content(ours).c_str());
+    Paired::Compare(
+        "json: 100,000 structs of six fields, to a file", 20,
+        {{"json formatter", [&] { Print(list, "json", ours); }},
+         {"RapidJSON PrettyWriter", [&] { PrintWithRapidJson(rapidRows, peer); }, "at most 1.2"},
+         {"nlohmann << std::setw(3)", [&] { std::ofstream(peer) << std::setw(3) << nlohmannRows; },
+          "at most 0.33"},
+         {"nlohmann dump(3)", [&] { PrintWithNlohmann(nlohmannRows, peer); }, "at most 0.33"}});
+}
+
+// By the byte, for each gives another text; a copy of the text is what the file alone costs.
+void CompareFormatters(const List& list, const std::string& ours, const std::string& peer) {
+    std::vector<Paired::Contender> contenders;
+    for (const char* name : {"table", "simple", "json", "xml", "python"}) {
+        const auto print = [&list, &ours, name] { Print(list, name, ours); };
+        const long growth = Memory::GrowthWhile(print);
+        const auto text = std::make_shared<std::string>(Content(ours));
+        const double megabytes = static_cast<double>(text->size()) / 1e6;
+        std::printf("%s: memory grows by %ld KiB for %.1f MB of text\n", name, growth, megabytes);
+        const auto copy = [&peer, text] {
+            std::ofstream(peer).write(text->data(), static_cast<std::streamsize>(text->size()));
+        };
+        contenders.push_back({name, print, contenders.empty() ? "" : "at least 1", megabytes});
+        contenders.push_back({"  std::ostream::write of its text", copy, "", megabytes});
+    }
+    std::printf("\n");
+    Paired::Compare("all formatters, time for one MB of text", 20, contenders);
+}
+
+}  // namespace
+
+int main() {
+    const std::string folder =
+        std::filesystem::temp_directory_path() / "zelmar-formatters-benchmark-";
+    const std::string ours = folder + "ours", peer = folder + "peer";
+    const List list = Rows::Make(100'000);
+    CompareFormatters(list, ours, peer);  // first: what the peers leave behind would hide growth
+    CompareJson(list, ours, peer);
+    for (const std::string& file : {ours, peer}) {
+        std::filesystem::remove(file);
+    }
+}

@@ -85,8 +85,11 @@ public:
 
     bool Receive(Capacity& capacity, milliseconds patience) const {
         pollfd answers = {_answers, POLLIN, 0};
-        return poll(&answers, 1, static_cast<int>(patience.count())) == 1 &&
-               read(_answers, &capacity, sizeof capacity) == sizeof capacity;
+        int ready = -1;
+        do {
+            ready = poll(&answers, 1, static_cast<int>(patience.count()));
+        } while (ready < 0 && errno == EINTR);
+        return ready == 1 && read(_answers, &capacity, sizeof capacity) == sizeof capacity;
     }
 
 private:

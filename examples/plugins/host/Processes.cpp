@@ -11,6 +11,13 @@ namespace Host {
 
 namespace {
 
+// A process may call itself anything; what steers a terminal is kept away from it.
+std::string WithoutControls(std::string text) {
+    std::ranges::replace_if(
+        text, [](unsigned char c) { return std::iscntrl(c) != 0; }, ' ');
+    return text;
+}
+
 // The lines "Name:<tab>value" of a status file.
 std::map<std::string, std::string> ReadStatus(const std::filesystem::path& file) {
     std::map<std::string, std::string> fields;
@@ -62,7 +69,7 @@ std::optional<Process> ReadProcess(const std::filesystem::path& directory) {
     process.user = EffectiveUser(status["Uid"]);
     process.state = StateWord(status["State"]);
     process.memory = Number(status["VmRSS"]);
-    process.name = status["Name"];
+    process.name = WithoutControls(status["Name"]);
     process.command = ReadCommandLine(directory / "cmdline");
     if (process.command.empty()) {
         process.command = "[" + process.name + "]";

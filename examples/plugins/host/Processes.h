@@ -20,8 +20,8 @@ struct Process {
 };
 
 /// Reads one process from its directory in /proc; nothing when it ended meanwhile. Control
-/// characters of the command line become blanks, and a process without one gets its name in
-/// brackets.
+/// characters of the name and of the command line become blanks, and a process without a command
+/// line gets its name in brackets.
 std::optional<Process> ReadProcess(const std::filesystem::path& directory);
 
 /// Reads the processes of a directory like /proc, in the order of their numbers. Throws

@@ -52,6 +52,28 @@ void ReplaceFirst(std::string& text, std::string_view placeholder, const std::st
     }
 }
 
+// The end of the message about a value that does not fit the type; null when it fits.
+const char* ComplaintAbout(const std::string& value, ParameterType type) {
+    long number = 0;
+    bool truth = false;
+    switch (type) {
+        case ParameterTypeInt:
+        case ParameterTypeIntList:
+            return ParameterSpec::GetInt(value, number) ? nullptr : " expected type Integer";
+        case ParameterTypeBool:
+        case ParameterTypeBoolList:
+            if (ParameterSpec::GetBool(value, truth)) {
+                return nullptr;
+            }
+            return " expected one of [1, 0, y, n, true, false, True, False, yes, no, t, f, T, F]";
+        case ParameterTypeFlag:
+            return value.empty() ? nullptr
+                                 : ".  This parameter is a flag and cannot accept any values. ";
+        default:
+            return nullptr;
+    }
+}
+
 }  // namespace
 
 ParameterSpec::ParameterSpec(std::string&& name, ParameterType type)
@@ -167,36 +189,11 @@ bool ParameterSpec::ValidateCount(size_t count, Output& output) const {
 }
 
 bool ParameterSpec::ValidateType(const std::string& value, Output& output) const {
-    const std::string complaint = "Invalid data '" + value + "' for parameter " + _name;
-    long number = 0;
-    bool truth = false;
-    switch (_type) {
-        case ParameterTypeInt:
-        case ParameterTypeIntList:
-            if (!GetInt(value, number)) {
-                output.AddErrorMessage(complaint + " expected type Integer");
-                return false;
-            }
-            return true;
-        case ParameterTypeBool:
-        case ParameterTypeBoolList:
-            if (!GetBool(value, truth)) {
-                output.AddErrorMessage(
-                    complaint +
-                    " expected one of [1, 0, y, n, true, false, True, False, yes, no, t, f, T, F]");
-                return false;
-            }
-            return true;
-        case ParameterTypeFlag:
-            if (!value.empty()) {
-                output.AddErrorMessage(
-                    complaint + ".  This parameter is a flag and cannot accept any values. ");
-                return false;
-            }
-            return true;
-        default:
-            return true;
+    const char* complaint = ComplaintAbout(value, _type);
+    if (complaint) {
+        output.AddErrorMessage("Invalid data '" + value + "' for parameter " + _name + complaint);
     }
+    return !complaint;
 }
 
 }  // namespace CallSpec

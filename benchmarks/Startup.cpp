@@ -6,7 +6,9 @@ int main() {
     // A listing ends with 1, for no command has run.
     const auto kelvash = [] { Paired::RunProgram({.words = {KELVASH}, .status = 1}); };
     const auto floor = [] { Paired::RunProgram({.words = {FLOOR}}); };
-    Paired::Compare(
-        "start-up: kelvash lists an empty tree", 500,
-        {{"kelvash", kelvash}, {"same libraries, one expression, one line", floor, "at most 1.3"}});
+    const auto bareFloor = [] { Paired::RunProgram({.words = {BARE_FLOOR}}); };
+    Paired::Compare("start-up: kelvash lists an empty tree", 500,
+                    {{"kelvash", kelvash},
+                     {"its libraries, one expression, one line", floor, "at most 1.3"},
+                     {"the same without libzelmar", bareFloor}});
 }

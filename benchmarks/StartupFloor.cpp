@@ -1,5 +1,5 @@
-// The least that a tool of this kind can do: it loads the same libraries as kelvash, compiles one
-// expression and prints one line.
+// The least that a tool of this kind can do: it loads the libraries that it is linked with,
+// compiles one expression and prints one line.
 
 #include <boost/regex.hpp>
 

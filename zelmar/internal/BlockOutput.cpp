@@ -26,7 +26,12 @@ BlockOutput::BlockOutput(std::ostream& stream)
 }
 
 BlockOutput::~BlockOutput() {
-    const bool written = Drain() && (!_flushWanted || _target->pubsync() == 0);
+    bool written = false;
+    try {
+        written = Drain() && (!_flushWanted || _target->pubsync() == 0);
+    } catch (...) {
+        // A buffer that throws has not written either. Nothing may leave a destructor.
+    }
     ReplaceBuffer(_stream, _target, written ? std::ios_base::goodbit : std::ios_base::badbit);
 }
 
@@ -46,5 +51,5 @@ int BlockOutput::sync() {
 bool BlockOutput::Drain() {
     const std::streamsize size = pptr() - pbase();
     setp(_block.get(), _block.get() + blockSize);
-    return size == 0 || (_target && _target->sputn(_block.get(), size) == size);
+    return _target && (size == 0 || _target->sputn(_block.get(), size) == size);
 }

@@ -1,0 +1,231 @@
+#include <zelmar/autocli/formatters/Formatter.h>
+#include <zelmar/metaobj/MetaList.h>
+#include <zelmar/metaobj/MetaScalars.h>
+
+#include <gtest/gtest.h>
+
+#include <climits>
+#include <cstdio>
+
+using MetaObj::MetaBool;
+using MetaObj::MetaInt;
+using MetaObj::MetaList;
+using MetaObj::MetaObject;
+using MetaObj::MetaString;
+using MetaObj::MetaStruct;
+using MetaObj::MetaType;
+
+namespace AutoCli {
+namespace {
+
+using Value = std::shared_ptr<MetaObject>;
+
+std::string Formatted(const Value& value, const std::string& format) {
+    FormatParameters parameters;
+    parameters.SetParameter("printf:T.F", format);
+    return AutoCli_FormatField("T", "F", value, parameters);
+}
+
+// What the system's printf makes of the argument in the buffer that the format and value are given.
+template <class Argument>
+std::string Printed(const Value& value, const std::string& format, Argument argument) {
+    std::string buffer(format.size() + value->ToString().size() + 65, '\0');
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wformat-nonliteral"
+    (void)std::snprintf(buffer.data(), buffer.size(), format.c_str(), argument);
+#pragma GCC diagnostic pop
+    return buffer.c_str();
+}
+
+TEST(Field, HasUnitsAndAFormatByTypeAndName) {
+    FormatParameters parameters;
+    parameters.SetParameter("units:Disk.Size", "Mb");
+    parameters.SetParameter("units:Disk.Free", "");
+    parameters.SetParameter("printf:Disk.Size", "%08ld");
+    const auto field = [&parameters](const char* type, const char* name, const Value& value) {
+        return AutoCli_FormatField(type, name, value, parameters);
+    };
+    EXPECT_EQ(field("Disk", "Size", MetaInt::New(512)), "00000512 Mb");
+    EXPECT_EQ(field("Disk", "Free", MetaInt::New(512)), "512 ");
+    EXPECT_EQ(field("disk", "Size", MetaInt::New(512)), "512");
+    EXPECT_EQ(field("Disk", "Size", nullptr), "NULL Object");
+    EXPECT_EQ(field("Disk", "Size", MetaStruct::New("T")), " Mb");
+    EXPECT_EQ(field("Disk", "Size", MetaList::New(MetaType::Int)), " Mb");
+    EXPECT_EQ(field("Disk", "Size", MetaString::New("x")),
+              "Error while handling formatting parameter printf:Disk.Size.  Unable to format field:"
+              " Invalid argument");
+}
+
+TEST(Field, RefusesAFormatThatDoesNotFitTheValue) {
+    const std::string refusal =
+        "Error while handling formatting parameter printf:T.F.  Unable to format field: Invalid"
+        " argument";
+    const Value number = MetaInt::New(300);
+    const Value text = MetaString::New("abc");
+    for (const char* format : {"%n",
+                               "%*d",
+                               "%.*d",
+                               "%s",
+                               "%c",
+                               "%p",
+                               "%f",
+                               "%d%d",
+                               "%d %n",
+                               "%",
+                               "%l",
+                               "%5",
+                               "%5%",
+                               "%1$d",
+                               "%99999999999d",
+                               "%.99999999999d",
+                               "%2147483648d",
+                               "%hhhd",
+                               "%lhd",
+                               "%-",
+                               "%.",
+                               "%m",
+                               "%d%",
+                               "%wd",
+                               "%I64d",
+                               "% %",
+                               "%5.3"}) {
+        EXPECT_EQ(Formatted(number, format), refusal) << format;
+        EXPECT_EQ(Formatted(MetaBool::New(true), format), refusal) << format;
+    }
+    for (const char* format :
+         {"%d", "%ls", "%S", "%n", "%*s", "%s%s", "%.*s", "%c", "%hs", "%5%"}) {
+        EXPECT_EQ(Formatted(text, format), refusal) << format;
+    }
+}
+
+TEST(Field, PrintsTheWholeNumberWhateverLengthIsAskedFor) {
+    for (const char* format :
+         {"%d", "%hhd", "%hd", "%ld", "%lld", "%qd", "%jd", "%zd", "%td", "%Ld", "%i"}) {
+        EXPECT_EQ(Formatted(MetaInt::New(LONG_MIN), format), "-9223372036854775808") << format;
+    }
+    EXPECT_EQ(Formatted(MetaInt::New(300), "%hhd"), "300");
+    EXPECT_EQ(Formatted(MetaInt::New(-1), "<%hx>"), "<ffffffffffffffff>");
+    EXPECT_EQ(Formatted(MetaBool::New(true), "%d") + Formatted(MetaBool::New(), "%i"), "10");
+}
+
+TEST(Field, TakesPlainTextAndAtMostOneConversion) {
+    const Value text = MetaString::New("abc");
+    EXPECT_EQ(Formatted(text, ""), "");
+    EXPECT_EQ(Formatted(text, "%%d 100%%"), "%d 100%");
+    EXPECT_EQ(Formatted(text, "%%%s%%%%"), "%abc%%");
+    EXPECT_EQ(Formatted(MetaString::New(std::string("a\0b", 3)), "%s|"), "a|");
+    EXPECT_EQ(Formatted(text, std::string("%s\0%n", 5)), "abc");
+}
+
+TEST(Field, FormatsAsTheSystemDoes) {
+    for (const char* flags : {"", "-", "0", "+", " ", "#", "-0", "+ #", "'"}) {
+        for (const char* size : {"", "1", "7", "40", "300", "90000", "0.", ".0", ".5", "9.4", "4.9",
+                                 ".300", "400.300", "300.400", "90000.80000"}) {
+            for (const char* letter : {"d", "i", "o", "u", "x", "X"}) {
+                const std::string head = "a" + (std::string("%") + flags) + size;
+                for (const long number : {0L, 7L, -7L, 123456789L, LONG_MIN}) {
+                    const Value value = MetaInt::New(number);
+                    EXPECT_EQ(Formatted(value, head + "j" + letter + "%%z"),
+                              Printed(value, head + "j" + letter + "%%z", number))
+                        << head << letter;
+                }
+            }
+            const std::string format = (std::string("%") + flags) + size + "s|";
+            for (const char* text : {"", "abc", "a text of some length"}) {
+                const Value value = MetaString::New(text);
+                EXPECT_EQ(Formatted(value, format), Printed(value, format, text)) << format;
+            }
+        }
+    }
+}
+
+TEST(Field, IsCutAtTheBufferHoweverWideItShouldBe) {
+    const auto blanks = [](size_t count) { return std::string(count, ' '); };
+    EXPECT_EQ(Formatted(MetaInt::New(42), "%2147483647d"), blanks(12 + 2 + 64));
+    EXPECT_EQ(Formatted(MetaInt::New(42), "%-2147483647d|"), "42" + blanks(14 + 2 + 64 - 2));
+    EXPECT_EQ(Formatted(MetaInt::New(-4), "%.2147483647d"),
+              "-" + std::string(13 + 2 + 64 - 1, '0'));
+    EXPECT_EQ(Formatted(MetaInt::New(42), "%2147483647.2147483646d"),
+              " " + std::string(23 + 2 + 64 - 1, '0'));
+    EXPECT_EQ(Formatted(MetaString::New("abc"), "%2147483647s"), blanks(12 + 3 + 64));
+    EXPECT_EQ(Formatted(MetaString::New("abc"), "%.2147483647s|"), "abc|");
+    EXPECT_EQ(Formatted(MetaBool::New(), "%70d"), blanks(69) + "0");
+    EXPECT_EQ(Formatted(MetaBool::New(), "%74d"), blanks(73));
+}
+
+TEST(FormatParameters, SplitsAListAtCommasWithoutTrimming) {
+    using Elements = std::vector<std::string>;
+    const std::pair<const char*, Elements> cases[] = {
+        {"", {}},          {"a,b", {"a", "b"}}, {"a, b", {"a", " b"}}, {"a,,b", {"a", "", "b"}},
+        {",a", {"", "a"}}, {"a,", {"a"}},       {",", {""}},           {",,", {"", ""}},
+    };
+    FormatParameters parameters;
+    EXPECT_EQ(parameters.GetParameterAsList("fields"), Elements());
+    for (const auto& [value, elements] : cases) {
+        parameters.SetParameter("fields", value);
+        EXPECT_EQ(parameters.GetParameterAsList("fields"), elements) << value;
+        EXPECT_TRUE(parameters.HasParameter("fields"));
+    }
+    EXPECT_EQ(parameters.GetParameter("Fields"), "");
+    EXPECT_FALSE(parameters.HasParameter("Fields"));
+}
+
+TEST(FormatParameters, TheUsersChoiceIsLaidOverTheDefaults) {
+    FormatParameters base;
+    FormatParameters choice;
+    base.SetFormatter("table");
+    base.SetParameter("kept", "1");
+    base.SetParameter("both", "2");
+    choice.SetParameter("both", "");
+    choice.SetParameter("new", "3");
+    base.OverrideValues(choice);
+    EXPECT_EQ(base.GetFormatter(), "table");
+    choice.SetFormatter("json");
+    base.OverrideValues(choice);
+    EXPECT_EQ(base.GetFormatter(), "json");
+    EXPECT_EQ(base.GetParameters(),
+              (std::map<std::string, std::string>{{"both", ""}, {"kept", "1"}, {"new", "3"}}));
+    FormatParameters taker;
+    taker.SetParameter("gone", "");
+    taker = std::move(base);
+    EXPECT_EQ(taker.GetFormatter() + " " + taker.GetParameter("new"), "json 3");
+    EXPECT_FALSE(taker.HasParameter("gone"));
+}
+
+TEST(SubField, DotsLeadIntoNestedStructs) {
+    const auto inner = MetaStruct::New("Inner");
+    inner->SetField("b", "inner b");
+    inner->SetField("", "nameless");
+    const auto outer = MetaStruct::New("Outer");
+    outer->SetField("a", inner);
+    outer->SetField("b", "outer b");
+    outer->SetField("list", std::vector<long>{1, 2});
+    const std::pair<const char*, const char*> cases[] = {
+        {"b", "outer b"},
+        {"nosuch", "-"},
+        {"a.b", "inner b"},
+        {"nosuch.b", "outer b"},
+        {"nosuch.a.b", "inner b"},
+        {"b.a", "-"},
+        {"a.nosuch", "-"},
+        {"a.", "nameless"},
+        {"a..b", "-"},
+        {".b", "outer b"},
+        {"list", "1, 2"},
+        {"list.a", "-"},
+        {"a.nosuch.b", "inner b"},
+        {"", "-"},
+        {".", "-"},
+    };
+    for (const auto& [path, text] : cases) {
+        const auto value = GetSubField(outer, path);
+        EXPECT_EQ(value ? value->ToString() : "-", text) << path;
+    }
+}
+
+TEST(Indent, IsThreeBlanksALevel) {
+    EXPECT_EQ(GetIndent(-1) + "|" + GetIndent(0) + "|" + GetIndent(2), "||      ");
+}
+
+}  // namespace
+}  // namespace AutoCli

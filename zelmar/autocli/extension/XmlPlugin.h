@@ -38,10 +38,8 @@ public:
     std::shared_ptr<Formatter> GetFormatter(const std::string& name) override;
     const std::vector<std::shared_ptr<Formatter>>& GetFormatters() override;
 
-private:
-    using Registration = std::pair<std::string, std::shared_ptr<NamespaceNode>>;
-
-    void ReadFile();
+    /// The steps of `Initialize`, each for one element: what it declares is noted for
+    /// `RegisterNamespaces`. The node must be an element, and is not kept.
     void AddNamespaces(const _xmlNode* node);
     void AddNamespace(const _xmlNode* node);
     void AddCommands(const _xmlNode* node);
@@ -50,6 +48,10 @@ private:
     /// The names in a path with dots between them. A dot at the end opens no further one.
     static std::list<std::string> SplitPath(const std::string& path);
 
+private:
+    using Registration = std::pair<std::string, std::shared_ptr<NamespaceNode>>;
+
+    void ReadFile();
     void RequireFree(const std::shared_ptr<Namespace>& root, const Registration& registration);
     static void Register(const std::shared_ptr<Namespace>& root, const Registration& registration);
 

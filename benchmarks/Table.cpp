@@ -65,10 +65,8 @@ void ForEachCell(const MetaObject& row, Work work) {
 // that this table does not need.
 void PrintByHand(const List& list, const std::string& file) {
     const auto names = list->GetListStructure()->GetFieldNames();
-    std::vector<size_t> widths;
-    for (const std::string& name : names) {
-        widths.push_back(name.size());
-    }
+    std::vector<size_t> widths(names.size());
+    std::ranges::transform(names, widths.begin(), [](const auto& name) { return name.size(); });
     for (const auto& row : list->GetObjects()) {
         ForEachCell(*row, [&](size_t i, const MetaObject&, std::string_view text) {
             widths[i] = std::max(widths[i], text.size());
@@ -97,7 +95,9 @@ void PrintByHand(const List& list, const std::string& file) {
 }
 
 void PrintWithSmartcols(const List& list, const std::string& file) {
+    const std::unique_ptr<FILE, int (*)(FILE*)> stream(std::fopen(file.c_str(), "w"), &std::fclose);
     libscols_table* table = scols_new_table();
+    scols_table_set_stream(table, stream.get());
     for (const auto& [name, field] : list->GetListStructure()->GetFields()) {
         const bool isInt = field.value->GetType() == MetaType::Int;
         scols_table_new_column(table, name.c_str(), 0, isInt ? SCOLS_FL_RIGHT : 0);
@@ -108,10 +108,7 @@ void PrintWithSmartcols(const List& list, const std::string& file) {
             scols_line_set_data(line, i, std::string(text).c_str());
         });
     }
-    FILE* stream = std::fopen(file.c_str(), "w");
-    scols_table_set_stream(table, stream);
     scols_print_table(table);
-    std::fclose(stream);
     scols_unref_table(table);
 }
 

@@ -84,7 +84,6 @@ void Drain(FileDescriptor& pipe, std::string& text) {
 // Both directions at once: a process may print more than a pipe holds before it has read its input.
 void Pump(FileDescriptor& input, std::string_view inputText, FileDescriptor& output,
           std::string& outputText) {
-    Feed(input, inputText);
     while (input.Get() >= 0 || output.Get() >= 0) {
         pollfd ends[] = {{input.Get(), POLLOUT, 0}, {output.Get(), POLLIN, 0}};
         if (poll(ends, std::size(ends), -1) < 0 && !IsWorthRepeating()) {
@@ -120,12 +119,16 @@ int AutoCli_ShellCmd(const std::string& command, std::string& output, const std:
     if (!outputPipe.Open()) {
         throw SystemFailure("Can't create output pipe");
     }
+    // As long as the reading end is open here, no write fails: a short text is written before there
+    // is a process that could end without having read it.
     fcntl(inputPipe.writeEnd.Get(), F_SETFL, O_NONBLOCK);
+    std::string_view unwritten = input;
+    Feed(inputPipe.writeEnd, unwritten);
     const int processId = StartShell(command, inputPipe, outputPipe);
     inputPipe.readEnd.Close();
     outputPipe.writeEnd.Close();
 
-    Pump(inputPipe.writeEnd, input, outputPipe.readEnd, output);
+    Pump(inputPipe.writeEnd, unwritten, outputPipe.readEnd, output);
     const int status = WaitFor(processId, command);
     if (commandExecListener) {
         commandExecListener(command, status);

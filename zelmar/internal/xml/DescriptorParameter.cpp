@@ -214,7 +214,7 @@ std::vector<std::pair<std::string, std::string>> ExtractEnum(const xmlNode* node
                 throw ZelmarException(
                     "Error parsing 'enum-value', missing required attribute 'value'");
             }
-            entries.emplace_back(value, reinterpret_cast<const char*>(text->content));
+            entries.emplace_back(value, XmlUtil_GetText(text));
         });
     });
     return entries;

@@ -8,7 +8,8 @@
 
 // Readers of single nodes. Nothing is trimmed, and what is absent reads as an empty string. Names
 // are compared exactly; a node without a name, which a CDATA section is, has an empty one and so
-// matches none.
+// matches none. A document that declares more text than is sane throws `ZelmarException` where it
+// is read: "The declarations of the document stand for more than 10000000 bytes".
 
 namespace AutoCli {
 
@@ -30,7 +31,10 @@ using XmlDocument = std::unique_ptr<xmlDoc, XmlDocumentDeleter>;
 
 [[nodiscard]] std::string XmlUtil_ExtractAttribute(const xmlNode* node, const std::string& name);
 
-/// The text of the last child that has one: texts, CDATA sections and comments do.
+/// The text of a node whose `content` is not null: texts, CDATA sections and comments have one.
+[[nodiscard]] std::string XmlUtil_GetText(const xmlNode* node);
+
+/// The text of the last child that has one.
 [[nodiscard]] std::string XmlUtil_GetContent(const xmlNode* node);
 
 /// The content of the child of that name. Throws `ZelmarException` when there is another one behind

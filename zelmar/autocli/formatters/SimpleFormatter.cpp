@@ -2,6 +2,8 @@
 #include <zelmar/internal/text/ValueWalk.h>
 
 #include <boost/algorithm/string/replace.hpp>
+#include <optional>
+#include <span>
 
 using MetaObj::MetaList;
 using MetaObj::MetaObject;
@@ -22,13 +24,26 @@ std::string TagIn(const std::string& heading) {
     return open == std::string::npos ? "" : heading.substr(open + 1, close - open - 1);
 }
 
-std::string HeadingOf(const MetaStruct& value, const FormatParameters& parameters) {
-    const std::string key = "header:" + value.GetTypeName();
-    if (!parameters.HasParameter(key)) {
-        return value.GetTypeName();
+// What the parameters say about structs of one type.
+struct Style {
+    Style(const std::string& typeName, const FormatParameters& parameters) {
+        if (const std::string key = "header:" + typeName; parameters.HasParameter(key)) {
+            heading = parameters.GetParameter(key);
+        }
+        for (const std::string& key : {"fields:" + typeName, std::string("fields")}) {
+            if (!fields && parameters.HasParameter(key)) {
+                fields = parameters.GetParameterAsList(key);
+            }
+        }
     }
-    std::string heading = parameters.GetParameter(key);
-    if (const std::string name = TagIn(heading); !name.empty()) {
+
+    std::optional<std::string> heading;              // none: the name of the type
+    std::optional<std::vector<std::string>> fields;  // none: all of them
+};
+
+std::string HeadingOf(const MetaStruct& value, const Style& style) {
+    std::string heading = style.heading.value_or(value.GetTypeName());
+    if (const std::string name = style.heading ? TagIn(heading) : ""; !name.empty()) {
         if (const auto field = value.GetField(name)) {
             boost::algorithm::replace_all(heading, "%" + name + "%", field->ToString());
         }
@@ -36,40 +51,59 @@ std::string HeadingOf(const MetaStruct& value, const FormatParameters& parameter
     return heading;
 }
 
-std::vector<std::string> NamesFor(const MetaStruct& value, const FormatParameters& parameters) {
-    for (const std::string& key : {"fields:" + value.GetTypeName(), std::string("fields")}) {
-        if (parameters.HasParameter(key)) {
-            return parameters.GetParameterAsList(key);
-        }
-    }
-    return value.GetFieldNames();
-}
-
-// The fields of a struct that are to be printed, which need not all be there.
+// The fields of a struct that are to be printed: all of them, or those that are named, which need
+// not be there.
 class ChosenFields {
 public:
-    ChosenFields(const MetaStruct& value, const FormatParameters& parameters)
-        : _struct(value), _names(NamesFor(value, parameters)) {
-        if (parameters.GetParameter("align-fields") == "true") {
-            for (const std::string& name : _names) {
-                _width = std::max(_width, name.size());
-            }
+    ChosenFields(const MetaStruct& value, const Style& style, bool aligned)
+        : _struct(value), _field(value.GetFields().begin()) {
+        if (style.fields) {
+            _names = *style.fields;
+            Find();
+        }
+        if (aligned) {
+            Measure();
         }
     }
 
-    [[nodiscard]] bool AtEnd() const { return _next == _names.size(); }
-    void Advance() { ++_next; }
-    void LeaveOutTheRest() { _names.resize(_next + 1); }
+    [[nodiscard]] bool AtEnd() const {
+        return _names ? _names->empty() : _field == _struct.GetFields().end();
+    }
+    void Advance() {
+        if (_names) {
+            _names = _names->subspan(1);
+            Find();
+        } else {
+            ++_field;
+        }
+    }
+    void LeaveOutTheRest() { _names = _names->first(1); }
 
     [[nodiscard]] const std::string& TypeName() const { return _struct.GetTypeName(); }
-    [[nodiscard]] const std::string& Name() const { return _names[_next]; }
-    [[nodiscard]] std::shared_ptr<MetaObject> Value() const { return _struct.GetField(Name()); }
+    [[nodiscard]] const std::string& Name() const {
+        return _names ? _names->front() : _field->first;
+    }
+    /// Null when the struct has no such field.
+    [[nodiscard]] std::shared_ptr<MetaObject> Value() const {
+        return _field == _struct.GetFields().end() ? nullptr : _field->second.value;
+    }
     [[nodiscard]] size_t Padding() const { return _width > 0 ? _width - Name().size() : 0; }
 
 private:
+    void Find() {
+        if (!AtEnd()) {
+            _field = _struct.GetFields().find(Name());
+        }
+    }
+    void Measure() {
+        for (ChosenFields rest = *this; !rest.AtEnd(); rest.Advance()) {
+            _width = std::max(_width, rest.Name().size());
+        }
+    }
+
     const MetaStruct& _struct;
-    std::vector<std::string> _names;
-    size_t _next = 0;
+    std::map<std::string, MetaStruct::Field>::const_iterator _field;
+    std::optional<std::span<const std::string>> _names;  // those that are still to come
     size_t _width = 0;  // of the longest name; 0 when names are not aligned
 };
 
@@ -79,7 +113,10 @@ public:
     static constexpr int itemDepth = 1;
 
     SimpleWriter(TextWriter& text, FormatParameters& parameters)
-        : ValueWriter(text), _parameters(parameters) {}
+        : ValueWriter(text),
+          _parameters(parameters),
+          _hasFieldFormats(HasFieldFormats(parameters)),
+          _aligned(parameters.GetParameter("align-fields") == "true") {}
 
     void Bool(bool value, int /*level*/) { WriteLine(value ? "true" : "false"); }
     void Int(long value, int /*level*/) {
@@ -89,14 +126,12 @@ public:
     void String(const std::string& value, int /*level*/) { WriteLine(value); }
 
     void OpenStruct(const MetaStruct& value, int level) {
-        if (const std::string heading = HeadingOf(value, _parameters); heading != "<NONE>") {
+        if (const std::string heading = HeadingOf(value, StyleOf(value)); heading != "<NONE>") {
             _text.AppendIndent(level);
             WriteLine(heading, ":");
         }
     }
-    [[nodiscard]] ChosenFields FieldsOf(const MetaStruct& value) const {
-        return {value, _parameters};
-    }
+    ChosenFields FieldsOf(const MetaStruct& value) { return {value, StyleOf(value), _aligned}; }
     bool OpenField(ChosenFields& field, int level) {
         const auto value = field.Value();
         if (!value) {
@@ -115,7 +150,7 @@ public:
             case MetaType::List:
                 return true;
             default:
-                WriteLine(AutoCli_FormatField(field.TypeName(), field.Name(), value, _parameters));
+                WriteScalar(field, value);
                 return false;
         }
     }
@@ -133,6 +168,23 @@ public:
     void Unknown() {}
 
 private:
+    const Style& StyleOf(const MetaStruct& value) {
+        const std::string& typeName = value.GetTypeName();
+        const auto style = _styles.find(typeName);
+        return style != _styles.end()
+                   ? style->second
+                   : _styles.try_emplace(typeName, typeName, _parameters).first->second;
+    }
+
+    void WriteScalar(const ChosenFields& field, const std::shared_ptr<MetaObject>& value) {
+        const auto* text = MetaObj::MetaCast<MetaObj::MetaString>(value.get());
+        if (text && !_hasFieldFormats) {
+            WriteLine(text->GetValue());  // itself, without a copy
+        } else {
+            WriteLine(AutoCli_FormatField(field.TypeName(), field.Name(), value, _parameters));
+        }
+    }
+
     // What ToString of the list gives, without a copy of it all.
     void WriteScalars(const MetaList& value) {
         std::string_view separator;
@@ -144,6 +196,9 @@ private:
     }
 
     FormatParameters& _parameters;
+    const bool _hasFieldFormats;
+    const bool _aligned;
+    std::map<std::string, Style> _styles;  // by the name of the type
 };
 
 }  // namespace

@@ -116,8 +116,8 @@ void WriteHead(std::ostream& stream, const FormatParameters& parameters) {
     text.Append("<?xml version=\"1.0\"?>");
     text.EndLine();
     if (parameters.HasParameter("stylesheet")) {
-        text.Append("<?xml-stylesheet type=\"text/xsl\" href=\"",
-                    parameters.GetParameter("stylesheet"), "\"?>");
+        text.Append(R"(<?xml-stylesheet type="text/xsl" href=")",
+                    parameters.GetParameter("stylesheet"), R"("?>)");
         text.EndLine();
     }
     text.Append("<output xmlns:kelvash=\"http://norvane.example/Products/TRELL/5.0/kelvash\">");

@@ -11,7 +11,6 @@
 
 using CallSpec::Output;
 using CallSpec::ParameterSpec;
-using MetaObj::MetaInt;
 using MetaObj::MetaString;
 using Zelmar::ZelmarException;
 

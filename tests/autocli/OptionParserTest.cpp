@@ -18,7 +18,7 @@ using Words = std::vector<std::string>;
 
 // --flag, --help and -h, --level and -l for an Int, --password and -p for a secret.
 std::shared_ptr<InputSpec> Declaration() {
-    const auto spec = InputSpec::New();
+    auto spec = InputSpec::New();
     const auto add = [&spec](const char* name, const char* shortName,
                              CallSpec::ParameterType type) {
         auto parameter = ParameterSpec::New(name, type);

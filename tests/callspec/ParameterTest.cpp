@@ -8,8 +8,6 @@
 #include <chrono>
 #include <climits>
 
-using std::string_literals::operator""s;
-
 namespace CallSpec {
 namespace {
 
@@ -106,10 +104,22 @@ TEST(Parameter, OnlyAStringCanBeSecretAndOnlyAFittingConstraintStays) {
 
 TEST(Parameter, ReadsIntegersAndTruthValues) {
     const std::pair<std::string, long> ints[] = {
-        {"-5", -5},  {"+5", 5},    {"  5", 5},   {"\n5", 5},
-        {"007", 7},  {"", 99},     {" ", 99},    {"12abc", 99},
-        {"5 ", 99},  {"0x10", 99}, {"1\0"s, 99}, {"99999999999999999999", LONG_MAX},
-        {"--5", 99}, {"-", 99},    {"1.0", 99},  {"-99999999999999999999", LONG_MIN},
+        {"-5", -5},
+        {"+5", 5},
+        {"  5", 5},
+        {"\n5", 5},
+        {"007", 7},
+        {"", 99},
+        {" ", 99},
+        {"12abc", 99},
+        {"5 ", 99},
+        {"0x10", 99},
+        {std::string("1\0", 2), 99},
+        {"99999999999999999999", LONG_MAX},
+        {"--5", 99},
+        {"-", 99},
+        {"1.0", 99},
+        {"-99999999999999999999", LONG_MIN},
     };
     for (const auto& [text, expected] : ints) {
         long number = 99;

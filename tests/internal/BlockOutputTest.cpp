@@ -49,7 +49,7 @@ TEST(BlockOutput, GathersFlushesAndMakesUpForThemOnce) {
         EXPECT_EQ(target.flushes, 0);
     }
     EXPECT_EQ(target.str(), expected);
-    EXPECT_EQ(target.writes, static_cast<int>(expected.size() / (64 * 1024) + 1));
+    EXPECT_EQ(target.writes, static_cast<int>(expected.size() / 65536 + 1));
     EXPECT_EQ(target.flushes, 1);
     EXPECT_EQ(stream.rdbuf(), &target);
 }

@@ -6,6 +6,7 @@
 
 #include <climits>
 #include <cstdio>
+#include <cstring>
 
 using MetaObj::MetaBool;
 using MetaObj::MetaInt;
@@ -34,7 +35,8 @@ std::string Printed(const Value& value, const std::string& format, Argument argu
 #pragma GCC diagnostic ignored "-Wformat-nonliteral"
     (void)std::snprintf(buffer.data(), buffer.size(), format.c_str(), argument);
 #pragma GCC diagnostic pop
-    return buffer.c_str();
+    buffer.resize(std::strlen(buffer.c_str()));
+    return buffer;
 }
 
 TEST(Field, HasUnitsAndAFormatByTypeAndName) {

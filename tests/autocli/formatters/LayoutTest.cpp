@@ -18,7 +18,6 @@ using CallSpec::ParameterSpec;
 using MetaObj::MetaInt;
 using MetaObj::MetaList;
 using MetaObj::MetaObject;
-using MetaObj::MetaString;
 using MetaObj::MetaStruct;
 using MetaObj::MetaType;
 

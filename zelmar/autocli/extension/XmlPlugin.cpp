@@ -57,10 +57,16 @@ std::shared_ptr<ExtensionCommand> ReadCommand(const xmlNode* node, const std::st
     return command;
 }
 
-// The parent of what is to be registered; `path` holds the names above it.
-std::shared_ptr<NamespaceNode> FindParent(const std::shared_ptr<Namespace>& root,
-                                          std::list<std::string>& path) {
-    return path.empty() ? root : root->ResolveNode(path);
+// Null when there is no such node yet. That is the rule and no failure, so it should not cost one.
+std::shared_ptr<NamespaceNode> FindNode(std::shared_ptr<NamespaceNode> node,
+                                        const std::list<std::string>& path) {
+    for (const std::string& name : path) {
+        if (!node->HasNamespaceNode(name)) {
+            return nullptr;
+        }
+        node = node->GetNamespaceNode(name);
+    }
+    return node;
 }
 
 bool AreTopLevelNamespaces(NamespaceNode& parent, NamespaceNode& one, NamespaceNode& other) {
@@ -164,13 +170,9 @@ void XmlPlugin::RequireFree(const std::shared_ptr<Namespace>& root,
     auto names = SplitPath(path);
     const std::string name = std::move(names.back());
     names.pop_back();
-    std::shared_ptr<NamespaceNode> parent;
-    try {
-        parent = FindParent(root, names);
-    } catch (const ZelmarException&) {
-        return;  // an entry before this one may be about to create the parent
-    }
-    const auto existing = parent->GetNamespaceNode(name);
+    // An entry before this one may be about to create the parent.
+    const auto parent = FindNode(root, names);
+    const auto existing = parent ? parent->GetNamespaceNode(name) : nullptr;
     if (!existing) {
         return;
     }
@@ -188,7 +190,7 @@ void XmlPlugin::Register(const std::shared_ptr<Namespace>& root, const Registrat
     auto names = SplitPath(path);
     const std::string name = std::move(names.back());
     names.pop_back();
-    const auto parent = FindParent(root, names);
+    const auto parent = names.empty() ? root : root->ResolveNode(names);
     const auto existing = parent->GetNamespaceNode(name);
     const bool isShared = existing && AreTopLevelNamespaces(*parent, *existing, *node) &&
                           existing->GetDescription() == node->GetDescription();

@@ -184,7 +184,7 @@ private:
     }
 
     void RemoveLeftovers() {
-        const std::string leftover = ".*\\$if\\{[a-z0-9-]+,.+?\\}.*";
+        const std::string leftover = R"(.*\$if\{[a-z0-9-]+,.+?\}.*)";
         size_t place = _text.find('{');
         if (!boost::regex_match(_text, boost::regex(leftover))) {
             return;

@@ -5,10 +5,10 @@
 #include <gtest/gtest.h>
 
 #include <fcntl.h>
-#include <signal.h>
 #include <sys/resource.h>
 #include <sys/wait.h>
 
+#include <csignal>
 #include <filesystem>
 #include <iterator>
 
@@ -126,7 +126,7 @@ TEST(ShellCmd, TellsWhyTheShellDoesNotStart) {
         close(next);
         const rlimit few = {static_cast<rlim_t>(next + free), before.rlim_max};
         setrlimit(RLIMIT_NOFILE, &few);
-        const std::string result = Shell("echo ran");
+        std::string result = Shell("echo ran");
         setrlimit(RLIMIT_NOFILE, &before);
         return result;
     };

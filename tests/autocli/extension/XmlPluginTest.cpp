@@ -10,7 +10,6 @@
 #include <filesystem>
 #include <fstream>
 
-using AutoCli::Namespace;
 using AutoCli::RootNamespace;
 using AutoCli::XmlPlugin;
 
@@ -307,12 +306,13 @@ TEST_F(XmlPluginTest, TellsWhatIsWrongWithAConstraint) {
 TEST_F(XmlPluginTest, RefusesFilesThatAreNoDescriptors) {
     const std::string unreadable = "Unable to parse XML descriptor: " + _path;
     EXPECT_EQ(LoadFile(), unreadable);
-    for (const std::string& text :
-         {std::string(),
-          std::string("\x7f"
-                      "ELF\0\1\2",
-                      7),
-          std::string("<p>"), std::string("<p>\xe9</p>"), std::string(50'000'000, 'x')}) {
+    std::string large;
+    large.resize(50'000'000, 'x');
+    for (const std::string& text : {std::string(),
+                                    std::string("\x7f"
+                                                "ELF\0\1\2",
+                                                7),
+                                    std::string("<p>"), std::string("<p>\xe9</p>"), large}) {
         EXPECT_EQ(LoadText(text), unreadable);
     }
     std::string deep;

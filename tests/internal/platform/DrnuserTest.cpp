@@ -3,9 +3,9 @@
 
 #include <gtest/gtest.h>
 
-#include <signal.h>
 #include <sys/wait.h>
 
+#include <csignal>
 #include <string>
 
 namespace {

@@ -8,7 +8,7 @@
 #include <utility>
 #include <vector>
 
-struct _xmlNode;
+struct _xmlNode;  // NOLINT(bugprone-reserved-identifier): the name that libxml2 gives it
 
 namespace AutoCli {
 

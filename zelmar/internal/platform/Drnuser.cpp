@@ -1,10 +1,10 @@
 #include <zelmar/internal/platform/Drnuser.h>
 
 #include <fcntl.h>
-#include <signal.h>
 #include <spawn.h>
 #include <unistd.h>
 
+#include <csignal>
 #include <cstdio>
 #include <cstring>
 

@@ -1,9 +1,9 @@
 #include <zelmar/internal/platform/Pipe.h>
 
 #include <fcntl.h>
-#include <signal.h>
 
 #include <cerrno>
+#include <csignal>
 #include <ctime>
 
 namespace {

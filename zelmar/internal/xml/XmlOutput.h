@@ -5,7 +5,7 @@
 #include <memory>
 #include <string_view>
 
-struct _xmlNode;
+struct _xmlNode;  // NOLINT(bugprone-reserved-identifier): the name that libxml2 gives it
 
 // From the dialect of XML that extension commands print to values. The same elements stand in a
 // descriptor as the prototype of a command's output. All operations throw `ZelmarException`, with

@@ -22,7 +22,7 @@ void Count(const xmlNode* user, size_t bytes) {
         throw ZelmarException("The declarations of the document stand for more than " +
                               std::to_string(limit) + " bytes");
     }
-    counter = reinterpret_cast<void*>(sum);
+    counter = reinterpret_cast<void*>(sum);  // NOLINT(performance-no-int-to-ptr): no pointer
 }
 
 std::string Counted(const xmlNode* user, std::string text) {

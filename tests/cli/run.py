@@ -23,7 +23,6 @@ or for status 0. After the name of a text may stand
 in which
 
     here          is the directory of the topic
-    fixtures      is tests/cli/fixtures
     commands      is examples/commands
     plugins       is where the example plugins are built
     test-plugins  is where the plugins of the tests are built
@@ -112,7 +111,6 @@ class Case:
     def run(self, build):
         with tempfile.TemporaryDirectory(prefix="kelvash-case-") as directory:
             for name, target in (("here", self.path.parent),
-                                 ("fixtures", CASES / "fixtures"),
                                  ("commands", ROOT / "examples" / "commands"),
                                  ("plugins", build / "plugins"),
                                  ("test-plugins", build / "test-plugins")):

@@ -63,7 +63,7 @@ std::string Read(const std::string& path) {
 
 }  // namespace
 
-// golden/<formatter>.txt holds the exact bytes, each value below a line "=== <its name>". After a
+// data/<formatter>.txt holds the exact bytes, each value below a line "=== <its name>". After a
 // wanted change, run with ZELMAR_UPDATE_GOLDEN=1 and read the difference with care.
 TEST(Formatters, SampleValuesGiveTheGoldenTexts) {
     const auto plugin = InternalPlugin::New();

@@ -13,7 +13,7 @@ import subprocess
 import unittest
 import xml.etree.ElementTree
 
-GOLDEN = pathlib.Path(__file__).resolve().parent / "golden"
+GOLDEN = pathlib.Path(__file__).resolve().parent / "data"
 EVERY_BYTE = bytes(range(256))
 DISKS = [{"Name": "sda", "Removable": False, "Size": 512},
          {"Name": "sdb1", "Removable": True, "Size": 16}]

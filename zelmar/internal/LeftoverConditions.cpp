@@ -134,11 +134,12 @@ private:
         return body != npos && body < close;
     }
 
+    // The brace of one inside pairs inside, and so behind its body.
     bool OpensInside(size_t close) {
         if (_opening.place < _next) {
             _opening = FindOpening(_text, _next);
         }
-        return _opening.place != npos && _opening.body < close;
+        return _opening.place < close;
     }
 
     std::string_view _text;

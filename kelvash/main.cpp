@@ -7,6 +7,7 @@
 #include <cstdlib>
 #include <filesystem>
 #include <iostream>
+#include <optional>
 
 namespace {
 
@@ -38,14 +39,16 @@ void CheckStandardOutput() {
 
 int main(int argc, char** argv) {
     std::atexit(&CheckStandardOutput);
+    // Outlives the handlers: the code of what they catch may lie in a plugin that goes with it.
+    std::optional<AutoCli::CliDispatcher> dispatcher;
     try {
-        AutoCli::CliDispatcher dispatcher;
+        dispatcher.emplace();
         std::error_code noError;
         // A machine without any plugins is nothing to complain of on every call.
         if (std::filesystem::exists(defaultPluginDirectory, noError)) {
-            dispatcher.AddDefaultDirectories();
+            dispatcher->AddDefaultDirectories();
         }
-        dispatcher.HandleArgvInput(argc, argv);
+        dispatcher->HandleArgvInput(argc, argv);
     } catch (const std::exception& error) {
         return ReportAndFail(error.what());
     } catch (...) {

@@ -1,5 +1,6 @@
 // Text laid out for people: wrapping, tables and the two help pages.
 
+#include <tests/support/Golden.h>
 #include <tests/support/TestCommand.h>
 #include <tests/support/Thrown.h>
 #include <zelmar/autocli/CommandInput.h>
@@ -15,7 +16,6 @@
 
 using CallSpec::Output;
 using CallSpec::ParameterSpec;
-using MetaObj::MetaInt;
 using MetaObj::MetaList;
 using MetaObj::MetaObject;
 using MetaObj::MetaStruct;
@@ -24,7 +24,7 @@ using MetaObj::MetaType;
 namespace AutoCli {
 namespace {
 
-using Parameters = std::vector<std::pair<const char*, const char*>>;
+using Parameters = std::vector<std::pair<std::string, std::string>>;
 
 template <class Printer>
 std::string Print(const std::shared_ptr<MetaObject>& root, const Parameters& values = {},
@@ -93,78 +93,6 @@ std::shared_ptr<MetaList> Rows(const std::vector<std::shared_ptr<MetaStruct>>& i
     return list;
 }
 
-TEST(Table, LaysOutItsColumns) {
-    const auto rows = Rows({Row("a", 10, "hello world"), Row("bb", 2000, "x")});
-    const struct {
-        Parameters parameters;
-        uint16_t width;
-        const char* table;
-    } cases[] = {
-        {{{"fields", "Name,Size,Note"}, {"wrap-last", "true"}},
-         0,
-         "Name  Size  Note\n"
-         "----  ----  ----\n"
-         "a       10  hello world\n"
-         "bb    2000  x\n"},
-        {{{"fields", "Name,Size,Note"}, {"wrap-last", "true"}},
-         20,
-         "Name  Size  Note\n"
-         "----  ----  ----\n"
-         "a       10  hello \n"
-         "            world\n"
-         "bb    2000  x\n"},
-        {{{"fields", "Name,Size,Note"}, {"wrap-last", "true"}, {"units:Row.Note", "!"}},
-         15,
-         "Name  Size  Note\n"
-         "----  ----  ----\n"
-         "a       10  hello world !\n"
-         "bb    2000  x !\n"},
-        {{{"fields", "Name,Note"}, {"wrap-last", "true"}, {"units:Row.Note", "!"}},
-         16,
-         "Name  Note\n"
-         "----  ----\n"
-         "a     hello \n"
-         "      world\n"
-         "bb    x\n"},
-        {{{"units:Row.Size", "Mb"}, {"printf:Row.Size", "%05ld"}},
-         9,
-         "Name  Note         Size\n"
-         "----  -----------  ----\n"
-         "a     hello world  00010 Mb  \n"
-         "bb    x            02000 Mb  \n"},
-        {{{"fields:Row", " \tName ,Name\r"}, {"fields", "Note"}},
-         0,
-         "NameName\n"
-         "----\n"
-         "aa\n"
-         "bbbb\n"},
-        {{{"fields:row", "Size"}, {"table-columns", "Size"}, {"header-line", "false"}},
-         0,
-         "Size\n"
-         "  10  \n"
-         "2000  \n"},
-        {{{"fields", "Note,Size,Note"}, {"show-header", ""}, {"table-header", "false"}},
-         0,
-         "hello world  10  hello world\n"
-         "x2000  x\n"},
-        {{{"fields", "Name"}, {"show-header", "true"}, {"table-header", "false"}},
-         0,
-         "Name\n----\na\nbb\n"},
-        {{{"fields", ""}}, 0, "\n\n"},
-    };
-    for (const auto& [parameters, width, table] : cases) {
-        EXPECT_EQ(Print<TableFormatter>(rows, parameters, width), table);
-    }
-    EXPECT_EQ(Print<TableFormatter>(Rows({}), {{"fields", "Size,Name"}}),
-              "Size  Name\n----  ----\n");
-}
-
-TEST(Table, WrapsEachLineOfItsLastCell) {
-    EXPECT_EQ(Print<TableFormatter>(Rows({Row("a", 1, "one two\n\nthree\n"), Row("b", 2, "")}),
-                                    {{"fields", "Name,Note"}, {"wrap-last", "true"}}, 12),
-              "Name  Note\n----  ----\na     one \n      two\n      \n      three\nb     \n");
-}
-
 TEST(Table, ReachesIntoNestedValues) {
     const auto disk = MetaStruct::New("Disk");
     disk->SetField("Size", 7);
@@ -186,13 +114,6 @@ TEST(Table, ComplainsBeforeItWritesAnything) {
         "Error: Unknown field in field list: Nosuch\n");
     const auto shapeless = MetaList::New(MetaType::Struct, std::shared_ptr<MetaStruct>());
     EXPECT_EQ(Print<TableFormatter>(shapeless), "");
-    const std::shared_ptr<MetaObject> others[] = {nullptr, MetaInt::New(1), Row("a", 1, "x"),
-                                                  MetaList::New(MetaType::Int)};
-    for (const auto& root : others) {
-        EXPECT_EQ(
-            Thrown([&] { (void)Print<TableFormatter>(root); }),
-            "Error: Unexpected type for output, formatter, table, expected a List of structs");
-    }
 }
 
 std::shared_ptr<ParameterSpec> Parameter(const char* name, const char* description, bool required,
@@ -218,6 +139,8 @@ std::shared_ptr<TestCommand> HelpfulCommand() {
                                      Parameter("silent", "", false, false), speed,
                                      Parameter("word", "Pass word.", true, true)});
     command->SetDescription("Does it, and says so at a length that is not wrapped.");
+    command->AddExample("--name x", "Sets the name to something short");
+    command->AddExample("", "Second");
     return command;
 }
 
@@ -236,66 +159,9 @@ std::shared_ptr<CommandInput> CallOfKelvash() {
     return input;
 }
 
-TEST(CommandHelp, WrapsDescriptionsInTheirColumn) {
-    const auto command = HelpfulCommand();
-    command->AddExample("--name x", "Sets the name to something short");
-    command->AddExample("", "Second");
-    EXPECT_EQ(HelpPage(*command, CallOfKelvash(), 36),
-              "Usage: kelvash a b <options>\n"
-              "\n"
-              "Description: Does it, and says so at a length that is not wrapped.\n"
-              "\n"
-              "  -h|--help     Show the help \n"
-              "                message.\n"
-              "     --name     The name that it \n"
-              "                will have. \n"
-              "                (required)\n"
-              "     --silent   \n"
-              "  -s|--speed    How fast: \n"
-              "                    fast: in a hurry\n"
-              "                    slow: in no \n"
-              "                hurry\n"
-              "     --word     Pass word. \n"
-              "                (required secret)\n"
-              "                WARNING: Providing \n"
-              "                secret values on \n"
-              "                the command line is \n"
-              "                insecure because it \n"
-              "                may be logged or \n"
-              "                preserved in \n"
-              "                history files. \n"
-              "                Instead, specify \n"
-              "                this option with no \n"
-              "                value on the \n"
-              "                command line, and \n"
-              "                enter the value on \n"
-              "                the supplied \n"
-              "                prompt.\n"
-              "\n"
-              "Examples: \n"
-              "\n"
-              "    Sets the name to something \n"
-              "    short :\n"
-              "# kelvash a b --name x        \n"
-              "\n"
-              "    Second :\n"
-              "# kelvash a b         \n"
-              "\n");
-}
-
-TEST(CommandHelp, AskedForWithoutALineNamesNoCommand) {
-    EXPECT_EQ(HelpPage(*TestCommand::New(), CallSpec::Input::New(), 0),
-              "Usage:   <options>\n\nDescription: \n\n  -h|--help   Show the help message.\n");
-}
-
-TEST(CommandHelp, IsAValueWithTypedLists) {
-    const auto output = Output::New();
-    TestCommand::New()->GenerateHelpOutput(CallOfKelvash(), output);
-    EXPECT_EQ(
-        output->GetRootObject()->ToString(),
-        "{'Description' => '', 'Dispatcher' => 'kelvash', 'Example List' => '', 'Param List' =>"
-        " '{'Description' => 'Show the help message.', 'Name' => 'help', 'Required' => 'false',"
-        " 'Secret' => 'false', 'Short Name' => 'h', }', 'Path' => 'a b', }");
+TEST(Help, ComplainsOfWhatIsNoHelp) {
+    EXPECT_EQ(Thrown([] { (void)Print<CliDispatcherHelpFormatter>(Row("a", 1, "x")); }),
+              "Error: Unexpected type for help output, formatter expected a struct with help data");
     for (const auto& root : {std::shared_ptr<MetaObject>(),
                              std::shared_ptr<MetaObject>(MetaStruct::New("KelVashCommand"))}) {
         EXPECT_EQ(Thrown([&root] { (void)Print<CommandHelpFormatter>(root); }),
@@ -324,41 +190,47 @@ std::shared_ptr<MetaStruct> Page(const std::vector<std::vector<const char*>>& no
     return page;
 }
 
-TEST(Listing, ShowsNamespacesAndThenCommands) {
-    EXPECT_EQ(Print<CliDispatcherHelpFormatter>(Page({{"run", "Runs it until it stops.", "Command"},
-                                                      {"disk", "", "Namespace"},
-                                                      {"network", "All nets.", "Namespace"},
-                                                      {"odd", "Neither.", "Unknown"}}),
-                                                {}, 18),
-              "Usage: t [disp options] a b <namespaces> <command>\n"
-              "\n"
-              "For help please run t --help\n"
-              "\n"
-              "Available Namespaces: \n"
-              "\n"
-              "disk     \n"
-              "network  All nets.\n"
-              "\n"
-              "Available Commands: \n"
-              "\n"
-              "run   Runs it \n"
-              "      until it \n"
-              "      stops.\n"
-              "\n");
-}
-
-TEST(Listing, HasPlaceholdersForWhatIsMissing) {
-    const auto page = Page({});
+// What stands in data/layout.txt, each page below a line "=== <what it shows>".
+TEST(Layout, PagesAreTheGoldenOnes) {
+    std::string pages;
+    const auto rows = Rows({Row("a", 10, "hello world"), Row("bb", 2000, "x")});
+    const struct {
+        Parameters parameters;
+        uint16_t width;
+    } tables[] = {
+        {{{"fields", "Name,Size,Note"}, {"wrap-last", "true"}}, 0},
+        {{{"fields", "Name,Size,Note"}, {"wrap-last", "true"}}, 20},
+        {{{"fields", "Name,Size,Note"}, {"wrap-last", "true"}, {"units:Row.Note", "!"}}, 15},
+        {{{"fields", "Name,Note"}, {"wrap-last", "true"}, {"units:Row.Note", "!"}}, 16},
+        {{{"units:Row.Size", "Mb"}, {"printf:Row.Size", "%05ld"}}, 9},
+        {{{"fields:Row", " \tName ,Name\r"}, {"fields", "Note"}}, 0},
+        {{{"fields:row", "Size"}, {"table-columns", "Size"}, {"header-line", "false"}}, 0},
+        {{{"fields", "Note,Size,Note"}, {"show-header", ""}, {"table-header", "false"}}, 0},
+        {{{"fields", "Name"}, {"show-header", "true"}, {"table-header", "false"}}, 0},
+        {{{"fields", ""}}, 0},
+    };
+    for (const auto& [parameters, width] : tables) {
+        pages +=
+            "=== table " + testing::PrintToString(parameters) + " " + std::to_string(width) + "\n";
+        pages += Print<TableFormatter>(rows, parameters, width);
+    }
+    pages +=
+        "=== table without rows\n" + Print<TableFormatter>(Rows({}), {{"fields", "Size,Name"}});
+    pages += "=== table with lines in its last cell\n" +
+             Print<TableFormatter>(Rows({Row("a", 1, "one two\n\nthree\n"), Row("b", 2, "")}),
+                                   {{"fields", "Name,Note"}, {"wrap-last", "true"}}, 12);
+    pages += "=== help\n" + HelpPage(*HelpfulCommand(), CallOfKelvash(), 36);
+    pages += "=== help without a line\n" + HelpPage(*TestCommand::New(), CallSpec::Input::New(), 0);
+    auto page = Page({{"run", "Runs it until it stops.", "Command"},
+                      {"disk", "", "Namespace"},
+                      {"network", "All nets.", "Namespace"},
+                      {"odd", "Neither.", "Unknown"}});
+    pages += "=== listing\n" + Print<CliDispatcherHelpFormatter>(page, {}, 18);
     page->SetField("Dispatcher", 1);
     page->SetField("Path", std::vector<std::string>());
     page->SetField("NamespaceNodes", "no list");
-    EXPECT_EQ(Print<CliDispatcherHelpFormatter>(page),
-              "Usage: <Dispatcher> [disp options] <namespaces> <command>\n\n"
-              "For help please run <Dispatcher> --help\n\n"
-              "Available Namespaces: \n\nERROR, list is bad\n"
-              "Available Commands: \n\nERROR, list is bad\n");
-    EXPECT_EQ(Thrown([] { (void)Print<CliDispatcherHelpFormatter>(Row("a", 1, "x")); }),
-              "Error: Unexpected type for help output, formatter expected a struct with help data");
+    pages += "=== listing of nothing\n" + Print<CliDispatcherHelpFormatter>(page);
+    ExpectGolden("layout.txt", pages);
 }
 
 }  // namespace

@@ -87,6 +87,28 @@ std::shared_ptr<MetaStruct> Names() {
     return names;
 }
 
+// Values whose class does not fit their kind, alone and between others.
+std::shared_ptr<MetaStruct> Misfits() {
+    auto misfits = MetaStruct::New("Misfits");
+    misfits->SetField("a", std::make_shared<Misfit>(MetaType::Int));
+    misfits->SetField("b", std::make_shared<Misfit>(MetaType::Struct));
+    misfits->SetField("c", 1);
+    return misfits;
+}
+
+// The factories refuse lists of lists and of no known kind; the constructor does not.
+std::shared_ptr<MetaList> Lists() {
+    const auto listOf = [](MetaType type) {
+        return std::make_shared<MetaList>(type, nullptr, MetaObj::MetaObject::FactoryFlag());
+    };
+    const auto lists = listOf(MetaType::List);
+    for (const MetaType type : {MetaType::Bool, MetaType::Int, MetaType::String, MetaType::List,
+                                MetaType::Struct, MetaType(7)}) {
+        lists->Add(listOf(type));
+    }
+    return lists;
+}
+
 Value Help() {
     AutoCli::Dispatcher dispatcher;
     auto input = AutoCli::CommandInput::New();
@@ -116,6 +138,15 @@ std::vector<std::pair<std::string, Value>> SampleValues() {
         {"texts", ListOf(Texts())},
         {"names", ListOf(Names())},
         {"help", Help()},
+        {"nothing", nullptr},
+        {"misfits", Misfits()},
+        {"misfit bool", std::make_shared<Misfit>(MetaType::Bool)},
+        {"misfit int", std::make_shared<Misfit>(MetaType::Int)},
+        {"misfit string", std::make_shared<Misfit>(MetaType::String)},
+        {"misfit struct", std::make_shared<Misfit>(MetaType::Struct)},
+        {"misfit list", std::make_shared<Misfit>(MetaType::List)},
+        {"misfit of no kind", std::make_shared<Misfit>(MetaType(7))},
+        {"lists of every kind", Lists()},
     };
 }
 

@@ -1,0 +1,20 @@
+#pragma once
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <fstream>
+#include <sstream>
+#include <string>
+
+/// Compares with the bytes of a file in the data directory of the test. After a wanted change, run
+/// with ZELMAR_UPDATE_GOLDEN=1 and read the difference with care.
+inline void ExpectGolden(const std::string& name, const std::string& text) {
+    const std::string path = DATA_DIR "/" + name;
+    if (std::getenv("ZELMAR_UPDATE_GOLDEN") != nullptr) {
+        std::ofstream(path, std::ios::binary) << text;
+    }
+    std::ostringstream golden;
+    golden << std::ifstream(path, std::ios::binary).rdbuf();
+    EXPECT_EQ(text, golden.str()) << path;
+}

@@ -1,4 +1,5 @@
-#include <zelmar/ZelmarException.h>
+#include <tests/support/Split.h>
+#include <tests/support/Thrown.h>
 #include <zelmar/autocli/extension/ExtensionCommand.h>
 #include <zelmar/metaobj/MetaObject.h>
 
@@ -30,6 +31,12 @@ protected:
         } else {
             unsetenv("LANG");
         }
+    }
+
+    void Give(const std::string& name) {
+        _input = Input::New();
+        _input->SetInputSpec(_spec);
+        _input->AddParameter("name", name);
     }
 
     // The value that the command gives, or its messages, one a line.
@@ -69,17 +76,14 @@ TEST_F(ExtensionCommandTest, TakesErrorLinesAtTheHeadOfTheOutput) {
 }
 
 TEST_F(ExtensionCommandTest, ReportsAProcessThatPrintsNothing) {
-    EXPECT_EQ(Execute("true"),
-              "[Got no data from process.\nCommand \"true\"\n\xd0\xb5xited with error code: 0]");
-    EXPECT_EQ(Execute("exit 7"),
-              "[Got no data from process.\nCommand \"exit 7\"\n\xd0\xb5xited with error code: 7]");
-    EXPECT_EQ(Execute("kill -9 $$"),
-              "[Got no data from process.\nCommand \"kill -9 $$\"\n\xd0\xb5xited with error code:"
-              " 137]");
+    const auto report = [](const std::string& line, const char* code) {
+        return "[Got no data from process.\nCommand \"" + line +
+               "\"\n\xd0\xb5xited with error code: " + code + "]";
+    };
+    EXPECT_EQ(Execute("exit 7"), report("exit 7", "7"));
+    EXPECT_EQ(Execute("kill -9 $$"), report("kill -9 $$", "137"));
     unsetenv("LANG");
-    EXPECT_EQ(Execute("true"),
-              "[Got no data from process.\nCommand \"LANG=en_US.UTF-8 true\"\n\xd0\xb5xited with"
-              " error code: 0]");
+    EXPECT_EQ(Execute("true"), report("LANG=en_US.UTF-8 true", "0"));
 }
 
 TEST_F(ExtensionCommandTest, ReportsOutputThatDoesNotBuild) {
@@ -106,33 +110,24 @@ TEST_F(ExtensionCommandTest, TellsTheProcessWhoAsksWhenItWantsToKnow) {
 }
 
 TEST_F(ExtensionCommandTest, IsIncompleteWithoutItsDeclarations) {
-    const auto message = [](auto request) -> std::string {
-        try {
-            request();
-        } catch (const Zelmar::ZelmarException& error) {
-            return error.what();
-        }
-        return "none";
-    };
     const auto command = ExtensionCommand::New();
-    EXPECT_EQ(message([&] { command->GetInputSpec(); }),
+    EXPECT_EQ(Thrown([&] { command->GetInputSpec(); }),
               "Request for NULL InputSpec.  Extension command is incomplete and will not work");
-    EXPECT_EQ(message([&] { command->GetOutputSpec(); }),
+    EXPECT_EQ(Thrown([&] { command->GetOutputSpec(); }),
               "Request for NULL OutputSpec.  Extension command is incomplete and will not work");
 }
 
 // Single quotes hold any value together, at the price of the single quotes in it.
 TEST_F(ExtensionCommandTest, KeepsAQuotedValueInsideItsArgument) {
-    std::vector<std::string> values = {
-        "$(echo x)", "`echo x`", "a;b", "a&&b", "|x",    ">/dev/full", "\\\\'", "';x;'", "\";x;",
-        "${IFS}",    "a\\b",     "#;x", "x y",  "{a,b}", "*",          "<(x)",  "!!",    "-n"};
+    auto values = Split(
+        "$(echo x)%`echo x`%a;b%a&&b%|x%>/dev/full%\\\\'%';x;'%\";x;%${IFS}%a\\b%#;x%"
+        "x y%{a,b}%*%<(x)%!!%-n",
+        '%');
     for (int byte = 1; byte < 256; ++byte) {
         values.push_back(std::string("a") + static_cast<char>(byte) + "b");
     }
     for (const std::string& value : values) {
-        _input = Input::New();
-        _input->SetInputSpec(_spec);
-        _input->AddParameter("name", value);
+        Give(value);
         std::string argument = value;
         std::erase(argument, '\'');
         std::ranges::replace(argument, '\n', 'N');
@@ -152,9 +147,7 @@ TEST_F(ExtensionCommandTest, RunsWhatACarelessTemplateLetsThrough) {
         {"echo $val{name} '$val{name}'", "ERROR:ran;:"},
     };
     for (const auto& [execute, value] : holes) {
-        _input = Input::New();
-        _input->SetInputSpec(_spec);
-        _input->AddParameter("name", value);
+        Give(value);
         EXPECT_EQ(Execute("exec 3>&1; " + std::string(execute)), "[ran]") << execute;
     }
 }

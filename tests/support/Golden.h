@@ -7,10 +7,9 @@
 #include <sstream>
 #include <string>
 
-/// Compares with the bytes of a file in the data directory of the test. After a wanted change, run
-/// with ZELMAR_UPDATE_GOLDEN=1 and read the difference with care.
-inline void ExpectGolden(const std::string& name, const std::string& text) {
-    const std::string path = DATA_DIR "/" + name;
+/// Compares with the bytes of the file, which stands in the data directory of the test. After a
+/// wanted change, run with ZELMAR_UPDATE_GOLDEN=1 and read the difference with care.
+inline void ExpectGolden(const std::string& path, const std::string& text) {
     if (std::getenv("ZELMAR_UPDATE_GOLDEN") != nullptr) {
         std::ofstream(path, std::ios::binary) << text;
     }

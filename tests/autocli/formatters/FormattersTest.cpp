@@ -56,7 +56,7 @@ TEST(Formatters, SampleValuesGiveTheGoldenTexts) {
         for (const auto& [name, value] : SampleValues()) {
             texts += "=== " + name + "\n" + TextOf(*formatter, value);
         }
-        ExpectGolden(formatter->GetName() + ".txt", texts);
+        ExpectGolden(DATA_DIR "/" + formatter->GetName() + ".txt", texts);
     }
 }
 

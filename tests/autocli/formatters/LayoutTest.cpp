@@ -230,7 +230,7 @@ TEST(Layout, PagesAreTheGoldenOnes) {
     page->SetField("Path", std::vector<std::string>());
     page->SetField("NamespaceNodes", "no list");
     pages += "=== listing of nothing\n" + Print<CliDispatcherHelpFormatter>(page);
-    ExpectGolden("layout.txt", pages);
+    ExpectGolden(DATA_DIR "/layout.txt", pages);
 }
 
 }  // namespace

@@ -167,14 +167,5 @@ TEST(OutputSpec, ChecksTheKindOfWhatWasDelivered) {
     EXPECT_EQ(spec->GetDescription(), "Documentation missing");
 }
 
-TEST(Output, HasFailedWithAnyMessageAtAll) {
-    const auto output = Output::New();
-    EXPECT_FALSE(output->HasError());
-    EXPECT_EQ(output->GetRootObject(), nullptr);
-    EXPECT_EQ(output->GetOutputType(), Output::OutputTypeNormal);
-    output->AddErrorMessage("");
-    EXPECT_TRUE(output->HasError());
-}
-
 }  // namespace
 }  // namespace CallSpec

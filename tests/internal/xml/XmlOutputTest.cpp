@@ -1,5 +1,6 @@
 // The dialect that extension commands print.
 
+#include <tests/support/Split.h>
 #include <zelmar/ZelmarException.h>
 #include <zelmar/internal/StreamInt.h>
 #include <zelmar/internal/xml/XmlOutput.h>
@@ -206,30 +207,11 @@ TEST_F(XmlOutput, DefusesEntityBombs) {
 }
 
 TEST(StreamInt, ReadsAsAStreamDoes) {
-    for (const char* text : {"",
-                             " ",
-                             "0",
-                             "+7",
-                             "-7",
-                             "+-7",
-                             "-+7",
-                             "--7",
-                             "- 7",
-                             "\t\v\f\r\n 12 3",
-                             "12abc",
-                             "0x10",
-                             "007",
-                             "+",
-                             "-",
-                             "abc",
-                             "1,000",
-                             "9223372036854775807",
-                             "-9223372036854775808",
-                             "9223372036854775808",
-                             "-9223372036854775809",
-                             "99999999999999999999x",
-                             ".5",
-                             "5."}) {
+    for (const auto& text :
+         Split("| |0|+7|-7|+-7|-+7|--7|- 7|\t\v\f\r\n 12 3|12abc|0x10|007|+|-|abc|1,000|"
+               "9223372036854775807|-9223372036854775808|9223372036854775808|"
+               "-9223372036854775809|99999999999999999999x|.5|5.",
+               '|')) {
         std::istringstream stream(text);
         stream.imbue(std::locale::classic());
         long number = 0;

@@ -69,13 +69,13 @@ TEST(Formatters, EveryLineEndIsAFlush) {
     for (const auto& formatter : Formatters()) {
         Counter counter;
         std::ostream stream(&counter);
-        Write(*formatter, SampleValues()[10].second, stream);
+        Write(*formatter, SampleValues()["nested list"], stream);
         EXPECT_EQ(counter.flushes, std::ranges::count(counter.str(), '\n')) << formatter->GetName();
 
         counter.flushes = 0;
         {
             const BlockOutput blocks(stream);
-            Write(*formatter, SampleValues()[10].second, stream);
+            Write(*formatter, SampleValues()["nested list"], stream);
         }
         EXPECT_EQ(counter.flushes, 1) << formatter->GetName();
     }

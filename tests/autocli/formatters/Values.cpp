@@ -1,11 +1,11 @@
 #include "Values.h"
 
 #include <zelmar/autocli/Dispatcher.h>
+#include <zelmar/internal/xml/XmlOutput.h>
 
-#include <limits>
+#include <fstream>
+#include <sstream>
 
-using MetaObj::MetaBool;
-using MetaObj::MetaInt;
 using MetaObj::MetaList;
 using MetaObj::MetaString;
 using MetaObj::MetaStruct;
@@ -21,61 +21,17 @@ std::string EveryByte() {
     return text;
 }
 
-std::shared_ptr<MetaStruct> Disk(const std::string& name, long size) {
-    auto disk = MetaStruct::New("Disk");
-    disk->SetField("Name", name);
-    disk->SetField("Size", size);
-    disk->SetField("Removable", size < 100);
-    return disk;
-}
-
-std::shared_ptr<MetaList> Disks() {
-    auto list = MetaList::New(MetaType::Struct, Disk("", 0));
-    list->Add(Disk("sda", 512));
-    list->Add(Disk("sdb1", 16));
-    return list;
-}
-
-// A list in a struct in a struct in a list, each with scalars around it.
-std::shared_ptr<MetaStruct> Host(const std::string& name) {
-    auto controller = MetaStruct::New("Controller");
-    controller->SetField("Disks", Disks());
-    controller->SetField("Ports", std::vector<long>{1, -2});
-    auto host = MetaStruct::New("Host");
-    host->SetField("Controller", controller);
-    host->SetField("Name", name);
-    host->SetField("Up", true);
-    return host;
-}
-
-std::shared_ptr<MetaList> Hosts() {
-    auto list = MetaList::New(MetaType::Struct, Host(""));
-    list->Add(Host("alpha"));
-    list->Add(Host("beta"));
-    return list;
-}
-
-std::shared_ptr<MetaList> Numbers() {
-    using Limits = std::numeric_limits<long>;
-    auto list = MetaList::New(MetaType::Int);
-    list->AddAll(std::vector<long>{Limits::min(), -1, 0, Limits::max()});
-    return list;
+// The values of data/values.xml, by name.
+std::shared_ptr<MetaStruct> Samples() {
+    std::ostringstream document;
+    document << std::ifstream(DATA_DIR "/values.xml").rdbuf();
+    return std::dynamic_pointer_cast<MetaStruct>(AutoCli::XmlUtil_ParseXmlOutput(document.str()));
 }
 
 std::shared_ptr<MetaList> ListOf(const std::shared_ptr<MetaStruct>& item) {
     auto list = MetaList::New(MetaType::Struct, item);
     list->Add(item);
     return list;
-}
-
-std::shared_ptr<MetaStruct> Texts() {
-    auto texts = MetaStruct::New("Texts");
-    texts->SetField("empty", "");
-    texts->SetField("lines", "one\ntwo\r\n\tthree\n");
-    texts->SetField("markup", R"(<a href="x">100% 'R&D'</a> &lt; // \)");
-    texts->SetField("quotes", R"("ends in a quote")");
-    texts->SetField("utf8", "Zürich \u20ac \U0001F600");
-    return texts;
 }
 
 std::shared_ptr<MetaStruct> Names() {
@@ -122,20 +78,9 @@ Value Help() {
 
 }  // namespace
 
-std::vector<std::pair<std::string, Value>> SampleValues() {
-    return {
-        {"bool", MetaBool::New(true)},
-        {"int", MetaInt::New(std::numeric_limits<long>::min())},
-        {"empty string", MetaString::New()},
+std::map<std::string, Value> SampleValues() {
+    std::map<std::string, Value> values = {
         {"every byte", MetaString::New(EveryByte())},
-        {"empty struct", MetaStruct::New("Nothing")},
-        {"empty list", MetaList::New(MetaType::String)},
-        {"empty list of structs", MetaList::New(MetaType::Struct, Disk("", 0))},
-        {"list of integers", Numbers()},
-        {"list of structs", Disks()},
-        {"nested struct", Host("alpha")},
-        {"nested list", Hosts()},
-        {"texts", ListOf(Texts())},
         {"names", ListOf(Names())},
         {"help", Help()},
         {"nothing", nullptr},
@@ -148,6 +93,13 @@ std::vector<std::pair<std::string, Value>> SampleValues() {
         {"misfit of no kind", std::make_shared<Misfit>(MetaType(7))},
         {"lists of every kind", Lists()},
     };
+    const auto samples = Samples();
+    for (const auto& [name, field] : samples->GetFields()) {
+        values[name] = field.value;
+    }
+    const auto& disks = static_cast<const MetaList&>(*values["list of structs"]);
+    values["empty list of structs"] = MetaList::New(MetaType::Struct, disks.GetListStructure());
+    return values;
 }
 
 Value NestedStructs(int levels) {

@@ -3,16 +3,15 @@
 #include <zelmar/metaobj/MetaList.h>
 #include <zelmar/metaobj/MetaScalars.h>
 
+#include <map>
 #include <string>
-#include <utility>
-#include <vector>
 
 // The values that every formatter is fed.
 
 using Value = std::shared_ptr<MetaObj::MetaObject>;
 
-/// Each with a name for the test that fails.
-std::vector<std::pair<std::string, Value>> SampleValues();
+/// By name.
+std::map<std::string, Value> SampleValues();
 
 /// A struct in a struct, `levels` deep, around the text "core".
 Value NestedStructs(int levels);

@@ -9,43 +9,29 @@ import ast
 import json
 import pathlib
 import re
-import subprocess
 import unittest
 import xml.etree.ElementTree
 
-GOLDEN = pathlib.Path(__file__).resolve().parent / "data"
+DATA = pathlib.Path(__file__).resolve().parent / "data"
 EVERY_BYTE = bytes(range(256))
-DISKS = [{"Name": "sda", "Removable": False, "Size": 512},
-         {"Name": "sdb1", "Removable": True, "Size": 16}]
 
 
-def host(name):
-    return {"Controller": {"Disks": DISKS, "Ports": [1, -2]}, "Name": name, "Up": True}
+def from_values(element):
+    """A value of values.xml."""
+    if element.tag == "structure":
+        return {field.get("name"): from_values(field[0]) for field in element}
+    if element.tag == "list":
+        return [from_values(item) for item in element]
+    return {"int": int, "bool": "true".__eq__, "string": str}[element.tag](element.text or "")
 
 
-VALUES = {
-    "bool": True,
-    "int": -2**63,
-    "empty string": "",
-    "every byte": EVERY_BYTE.decode("latin-1"),
-    "empty struct": {},
-    "empty list": [],
-    "empty list of structs": [],
-    "list of integers": [-2**63, -1, 0, 2**63 - 1],
-    "list of structs": DISKS,
-    "nested struct": host("alpha"),
-    "nested list": [host("alpha"), host("beta")],
-    "texts": [{"empty": "",
-               "lines": "one\ntwo\r\n\tthree\n",
-               "markup": "<a href=\"x\">100% 'R&D'</a> &lt; // \\",
-               "quotes": "\"ends in a quote\"",
-               "utf8": "Z\u00fcrich \u20ac \U0001f600"}],
-}
+VALUES = {**from_values(xml.etree.ElementTree.parse(DATA / "values.xml").getroot()[0]),
+          "every byte": EVERY_BYTE.decode("latin-1"), "empty list of structs": []}
 
 
 def documents(formatter):
     """The texts, as bytes, by the names of the values."""
-    pieces = re.split(rb"^=== (.*)\n", (GOLDEN / f"{formatter}.txt").read_bytes(), flags=re.M)
+    pieces = re.split(rb"^=== (.*)\n", (DATA / f"{formatter}.txt").read_bytes(), flags=re.M)
     return {name.decode(): text for name, text in zip(pieces[1::2], pieces[2::2])}
 
 
@@ -71,10 +57,6 @@ def from_xml(element):
     return {"integer": int, "boolean": "true".__eq__, "string": str}[element.tag](text)
 
 
-def run(*command, text=b""):
-    return subprocess.run(command, input=text, capture_output=True, check=False)
-
-
 READERS = {
     "json": json.loads,
     "python": lambda text: ast.literal_eval(text.decode()),
@@ -96,11 +78,6 @@ class ReadBack(unittest.TestCase):
         for text, value in self.each("json"):
             self.assertEqual(json.loads(text), with_texts(value, bytes_as_characters))
 
-    def test_jq(self):  # its numbers have 53 bits
-        for text, value in self.each("json", leave_out=("int", "list of integers")):
-            read = json.loads(run("jq", ".", text=text).stdout)
-            self.assertEqual(read, with_texts(value, bytes_as_characters))
-
     def test_python(self):
         for text, value in self.each("python", leave_out=("every byte", "texts")):
             self.assertEqual(ast.literal_eval(text.decode()), value)
@@ -114,15 +91,9 @@ class ReadBack(unittest.TestCase):
 
     def test_xml(self):
         for text, value in self.each("xml", leave_out=("every byte",)):
-            self.assertEqual(run("xmllint", "--noout", "-", text=text).stderr, b"")
             read = from_xml(xml.etree.ElementTree.fromstring(text).find("root")[0])
             # Every reader of XML takes the end of a line, in whatever form, for a line feed.
             self.assertEqual(read, with_texts(value, lambda t: t.replace("\r\n", "\n")))
-
-    def test_xpath(self):
-        path = "string(//structure[@typeName='Host']/field[@name='Name']/string)"
-        text = documents("xml")["nested struct"]
-        self.assertEqual(run("xmllint", "--xpath", path, "-", text=text).stdout, b"alpha\n")
 
     def test_what_is_refused(self):
         for formatter, name in REFUSED:

@@ -192,8 +192,10 @@ TEST_F(XmlOutput, DefusesEntityBombs) {
     }
     const std::string large = "<!DOCTYPE o [<!ENTITY e '" + std::string(100000, 'a') + "'>]>";
     std::string items;
+    std::string fields;
     for (int i = 0; i < 101; ++i) {
         items += "<string>&e;</string>";
+        fields += "<field><int/></field>";
     }
     const std::string refused =
         "! The declarations of the document stand for more than 10000000 bytes";
@@ -203,6 +205,9 @@ TEST_F(XmlOutput, DefusesEntityBombs) {
     EXPECT_EQ(Read(laughs + "]><o><structure typeName='&a11;'/></o>"), "none");
     EXPECT_EQ(Read(large + "<o><structure typeName='" + references + "'/></o>"), refused);
     EXPECT_EQ(Read(large + "<o><list type='string'>" + items + "</list></o>"), refused);
+    EXPECT_EQ(Read("<!DOCTYPE o [<!ATTLIST field name CDATA '" + std::string(100000, 'a') +
+                   "'>]><o><structure typeName='A'>" + fields + "</structure></o>"),
+              refused);
     EXPECT_LT(std::clock() - begin, 3 * CLOCKS_PER_SEC);
 }
 

@@ -24,6 +24,7 @@ XmlDocument ReadDocument(const std::string& path) {
     if (!document) {
         throw ZelmarException("Unable to parse XML descriptor: " + path);
     }
+    XmlUtil_CheckDeclarations(document.get());
     return document;
 }
 

@@ -19,12 +19,13 @@ void ExtractMetaData(const xmlNode* node, const CommandSpec& /*command*/) {
                 "Found unexpected tag while building meta-data set.  Unexpected tag was: " +
                 std::string(tag));
         }
-        XmlUtil_ForEachChild(entry, [entry](const xmlNode* child) {
-            if (child->content && XmlUtil_ExtractAttribute(entry, "name").empty()) {
-                throw ZelmarException(
-                    "Error parsing 'meta-data-entry', missing required attribute 'name'");
-            }
-        });
+        bool hasContent = false;
+        XmlUtil_ForEachChild(
+            entry, [&](const xmlNode* child) { hasContent = hasContent || child->content; });
+        if (hasContent && XmlUtil_ExtractAttribute(entry, "name").empty()) {
+            throw ZelmarException(
+                "Error parsing 'meta-data-entry', missing required attribute 'name'");
+        }
     });
 }
 

@@ -183,7 +183,10 @@ std::shared_ptr<MetaObject> XmlUtil_ParseXmlOutput(std::string_view text) {
         "Error parsing command output.  Unable to build a proper metaobject from output tag."
         "  output must contain properly formatted tags of type bool, int, string, structure and"
         " list. Error was : ",
-        [value] { return XmlUtil_BuildMetaObject(value); });
+        [&] {
+            XmlUtil_CheckDeclarations(document.get());
+            return XmlUtil_BuildMetaObject(value);
+        });
 }
 
 }  // namespace AutoCli

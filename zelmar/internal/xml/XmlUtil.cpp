@@ -1,6 +1,8 @@
 #include <zelmar/ZelmarException.h>
 #include <zelmar/internal/xml/XmlUtil.h>
 
+#include <cstring>
+
 using Zelmar::ZelmarException;
 
 namespace AutoCli {
@@ -11,39 +13,74 @@ const char* Chars(const xmlChar* text) {
     return reinterpret_cast<const char*>(text);
 }
 
-// What a document declares for itself, entities and defaults of attributes, can be far longer where
-// it is used than the document is. The parser does not count that, since it leaves references as
-// they are; so it is counted here, in the field of a document that the parser leaves to its users.
-void Count(const xmlNode* user, size_t bytes) {
-    constexpr size_t limit = 10'000'000;
-    void*& counter = user->doc->_private;
-    const size_t sum = reinterpret_cast<size_t>(counter) + bytes;
-    if (sum > limit) {
-        throw ZelmarException("The declarations of the document stand for more than " +
-                              std::to_string(limit) + " bytes");
+// Sums up what the declarations of a document stand for at the places where its elements use them.
+class DeclaredText {
+public:
+    void AddElement(const xmlNode* element) {
+        for (const xmlAttr* attribute = element->properties; attribute;
+             attribute = attribute->next) {
+            AddReferences(attribute->children);
+        }
+        AddDefaults(xmlGetDtdElementDesc(element->doc->intSubset, element->name));
+        AddReferences(element->children);
+        XmlUtil_ForEachChild(element, [this](const xmlNode* child) {
+            if (child->type == XML_ELEMENT_NODE) {
+                AddElement(child);
+            }
+        });
     }
-    counter = reinterpret_cast<void*>(sum);  // NOLINT(performance-no-int-to-ptr): no pointer
-}
 
-std::string Counted(const xmlNode* user, std::string text) {
-    Count(user, text.size());
-    return text;
-}
+private:
+    // An entity may hold references in turn.
+    void AddReferences(const xmlNode* nodes) {
+        for (const xmlNode* node = nodes; node; node = node->next) {
+            if (node->type == XML_ENTITY_REF_NODE) {
+                Add(node->content);
+                const xmlEntity* entity = xmlGetDocEntity(node->doc, node->name);
+                AddReferences(entity ? entity->children : nullptr);
+            }
+        }
+    }
 
+    void AddDefaults(const xmlElement* declaration) {
+        const xmlAttribute* attribute = declaration ? declaration->attributes : nullptr;
+        for (; attribute; attribute = attribute->nexth) {
+            Add(attribute->defaultValue);
+        }
+    }
+
+    // Each place counts, so that the sum bounds the time it takes as well.
+    void Add(const xmlChar* text) {
+        constexpr size_t limit = 10'000'000;
+        _bytes += 1 + (text ? std::strlen(Chars(text)) : 0);
+        if (_bytes > limit) {
+            throw ZelmarException("The declarations of the document stand for more than " +
+                                  std::to_string(limit) + " bytes");
+        }
+    }
+
+    size_t _bytes = 0;
+};
+
+// As `xmlNodeListGetString` does, in linear time.
 void AppendExpanded(const xmlNode* nodes, std::string& text) {
     for (const xmlNode* node = nodes; node; node = node->next) {
         if (node->type == XML_ENTITY_REF_NODE) {
-            Count(node, 1);
-            if (const xmlEntity* entity = xmlGetDocEntity(node->doc, node->name)) {
-                AppendExpanded(entity->children, text);
-            }
+            const xmlEntity* entity = xmlGetDocEntity(node->doc, node->name);
+            AppendExpanded(entity ? entity->children : nullptr, text);
         } else if (node->content) {
-            text += Counted(node, Chars(node->content));
+            text += Chars(node->content);
         }
     }
 }
 
 }  // namespace
+
+void XmlUtil_CheckDeclarations(const xmlDoc* document) {
+    if (document->intSubset) {
+        DeclaredText().AddElement(xmlDocGetRootElement(document));
+    }
+}
 
 std::string_view XmlUtil_GetName(const xmlNode* node) {
     return node->name ? Chars(node->name) : std::string_view();
@@ -64,21 +101,15 @@ std::string XmlUtil_ExtractAttribute(const xmlNode* node, const std::string& nam
         return {};
     }
     if (attribute->type == XML_ATTRIBUTE_DECL) {
-        const auto* declared = reinterpret_cast<const xmlAttribute*>(attribute);
-        return Counted(node, Chars(declared->defaultValue));
+        return Chars(reinterpret_cast<const xmlAttribute*>(attribute)->defaultValue);
     }
-    const xmlNode* value = attribute->children;
-    if (value && value->type == XML_TEXT_NODE && !value->next) {
-        return Chars(value->content);
-    }
-    std::string expanded;
-    AppendExpanded(value, expanded);
-    return expanded;
+    std::string value;
+    AppendExpanded(attribute->children, value);
+    return value;
 }
 
 std::string XmlUtil_GetText(const xmlNode* node) {
-    const char* text = Chars(node->content);
-    return node->type == XML_ENTITY_REF_NODE ? Counted(node, text) : text;
+    return node->content ? Chars(node->content) : "";
 }
 
 std::string XmlUtil_GetContent(const xmlNode* node) {

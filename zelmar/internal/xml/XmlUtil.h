@@ -8,8 +8,7 @@
 
 // Readers of single nodes. Nothing is trimmed, and what is absent reads as an empty string. Names
 // are compared exactly; a node without a name, which a CDATA section is, has an empty one and so
-// matches none. A document that declares more text than is sane throws `ZelmarException` where it
-// is read: "The declarations of the document stand for more than 10000000 bytes".
+// matches none.
 
 namespace AutoCli {
 
@@ -19,6 +18,12 @@ struct XmlDocumentDeleter {
 
 /// Owns a parsed document and with it all its nodes.
 using XmlDocument = std::unique_ptr<xmlDoc, XmlDocumentDeleter>;
+
+/// What a document declares for itself, entities and defaults of attributes, can be far longer
+/// where it is used than the document is. The parser does not count that, since it leaves
+/// references as they are; to be called before anything is read from a document of foreign origin.
+/// Throws `ZelmarException`: "The declarations of the document stand for more than 10000000 bytes".
+void XmlUtil_CheckDeclarations(const xmlDoc* document);
 
 [[nodiscard]] std::string_view XmlUtil_GetName(const xmlNode* node);
 
@@ -31,10 +36,10 @@ using XmlDocument = std::unique_ptr<xmlDoc, XmlDocumentDeleter>;
 
 [[nodiscard]] std::string XmlUtil_ExtractAttribute(const xmlNode* node, const std::string& name);
 
-/// The text of a node whose `content` is not null: texts, CDATA sections and comments have one.
+/// The content of a node that has one: texts, CDATA sections, comments and references do.
 [[nodiscard]] std::string XmlUtil_GetText(const xmlNode* node);
 
-/// The text of the last child that has one.
+/// The content of the last child that has one.
 [[nodiscard]] std::string XmlUtil_GetContent(const xmlNode* node);
 
 /// The content of the child of that name. Throws `ZelmarException` when there is another one behind

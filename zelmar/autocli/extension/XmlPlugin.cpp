@@ -84,8 +84,11 @@ std::shared_ptr<XmlPlugin> XmlPlugin::New(const std::string& path) {
 }
 
 void XmlPlugin::Initialize() {
-    WithContext("Unable to handle XML Plugin " + _path + ".  There was an error while parsing: ",
-                [this] { ReadFile(); });
+    WithContext(
+        [this] {
+            return "Unable to handle XML Plugin " + _path + ".  There was an error while parsing: ";
+        },
+        [this] { ReadFile(); });
 }
 
 void XmlPlugin::ReadFile() {
@@ -137,8 +140,9 @@ void XmlPlugin::AddCommand(const _xmlNode* node) {
             " attribute");
     }
     const std::string description = XmlUtil_GetContentForChildByTag(node, "description");
-    auto command = WithContext("Unable to register the command 'kelvash " + path + "'  Error was ",
-                               [&] { return ReadCommand(node, description); });
+    auto command = WithContext(
+        [&path] { return "Unable to register the command 'kelvash " + path + "'  Error was "; },
+        [&] { return ReadCommand(node, description); });
     _registrations.emplace_back(path, std::move(command));
 }
 

@@ -73,7 +73,7 @@ std::shared_ptr<OutputSpec> ExtractOutputSpec(const xmlNode* node) {
                 std::string(XmlUtil_GetName(child)));
         }
         hasValue = true;
-        WithContext("Unable to build output spec.  Error was ",
+        WithContext([] { return "Unable to build output spec.  Error was "; },
                     [&] { outputSpec->SetRootObject(XmlUtil_BuildMetaObject(child)); });
     });
     return outputSpec;

@@ -152,20 +152,23 @@ ParameterType CheckParameterText(const ParameterText& text) {
 }  // namespace
 
 void ExtractInputParam(const xmlNode* node, InputSpec& inputSpec) {
-    const ParameterText text = ReadParameterText(node);
+    ParameterText text = ReadParameterText(node);
     auto parameter = ParameterSpec::New(text.name, CheckParameterText(text));
     if (!text.shortName.empty()) {
         parameter->SetShortName(text.shortName);
     }
-    parameter->SetDescription(text.description);
+    parameter->SetDescription(std::move(text.description));
     parameter->SetRequired(text.required == "true");
     if (text.secret == "true") {
         parameter->SetSecret(true);
     }
     XmlUtil_ForEachChild(node, "constraint", [&parameter](const xmlNode* constraint) {
-        WithContext("Unable to build parameter constraint for parameter " + parameter->GetName() +
-                        ".  Error was: ",
-                    [&] { parameter->SetConstraint(ExtractParamConstraint(constraint)); });
+        WithContext(
+            [&parameter] {
+                return "Unable to build parameter constraint for parameter " +
+                       parameter->GetName() + ".  Error was: ";
+            },
+            [&] { parameter->SetConstraint(ExtractParamConstraint(constraint)); });
     });
     inputSpec.AddParameter(parameter);
 }

@@ -180,9 +180,11 @@ std::shared_ptr<MetaObject> XmlUtil_ParseXmlOutput(std::string_view text) {
         return nullptr;
     }
     return WithContext(
-        "Error parsing command output.  Unable to build a proper metaobject from output tag."
-        "  output must contain properly formatted tags of type bool, int, string, structure and"
-        " list. Error was : ",
+        [] {
+            return "Error parsing command output.  Unable to build a proper metaobject from output"
+                   " tag.  output must contain properly formatted tags of type bool, int, string,"
+                   " structure and list. Error was : ";
+        },
         [&] {
             XmlUtil_CheckDeclarations(document.get());
             return XmlUtil_BuildMetaObject(value);

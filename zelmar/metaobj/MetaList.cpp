@@ -172,32 +172,11 @@ bool MetaList::Validate(const std::shared_ptr<MetaObject>& item,
 
 bool MetaList::IsSameStructure(const std::shared_ptr<MetaObject>& other,
                                std::vector<std::string>* errors) const {
-    if (!other) {
-        return Refuse(errors, "Mismatch on structure, NULL comparison");
-    }
-    if (other->GetType() != MetaType::List) {
-        return Refuse(errors, "Type mismatch!  Was expecting a List, but got a " +
-                                  MetaTypeString(other->GetType()));
-    }
-    const auto* input = MetaCast<MetaList>(other.get());
-    if (!input || input->_listType != _listType) {
-        return Refuse(errors, "Mismatch on list type");
-    }
-    if (!_listStructure || !input->_listStructure ||
-        _listStructure->IsSameStructure(input->_listStructure, errors)) {
-        return true;
-    }
-    return Refuse(errors, "List type mismatch list and input");
+    return CompareStructure(*this, other, errors);
 }
 
 std::string MetaList::ToString() const {
-    std::string text;
-    const char* separator = "";
-    for (const auto& object : _objects) {
-        text.append(separator).append(object->ToString());
-        separator = ", ";
-    }
-    return text;
+    return NestedText(*this);
 }
 
 }  // namespace MetaObj

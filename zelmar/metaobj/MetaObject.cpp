@@ -12,17 +12,10 @@ const std::string& MetaTypeString(const MetaType& type) {
     return index < words.size() ? words[index] : none;
 }
 
-namespace {
-
-bool IsScalar(const MetaObject& value) {
-    return value.GetType() != MetaType::Struct && value.GetType() != MetaType::List;
-}
-
-}  // namespace
-
 bool MetaObject::IsSameStructure(const std::shared_ptr<MetaObject>& other,
                                  std::vector<std::string>* errors) const {
-    if (other && IsScalar(*this) && other->_type == _type) {
+    const bool isScalar = _type != MetaType::Struct && _type != MetaType::List;
+    if (other && isScalar && other->_type == _type) {
         return true;
     }
     if (errors) {
@@ -30,25 +23,6 @@ bool MetaObject::IsSameStructure(const std::shared_ptr<MetaObject>& other,
                           " got " + (other ? MetaTypeString(other->_type) : std::string()));
     }
     return false;
-}
-
-void MetaObject::Release(std::shared_ptr<MetaObject>&& value) {
-    if (!value || IsScalar(*value)) {
-        return;
-    }
-    thread_local std::vector<std::shared_ptr<MetaObject>>* waiting = nullptr;
-    if (waiting) {
-        waiting->push_back(std::move(value));
-        return;
-    }
-    std::vector<std::shared_ptr<MetaObject>> values;
-    waiting = &values;
-    value.reset();
-    while (!values.empty()) {
-        const auto next = std::move(values.back());
-        values.pop_back();
-    }
-    waiting = nullptr;
 }
 
 std::ostream& operator<<(std::ostream& out, const MetaObject& value) {

@@ -19,7 +19,7 @@ ZELMAR_EXPORT const std::string& MetaTypeString(const MetaType& type);
 
 /// A self-describing value: what commands return and how they declare the shape of what they
 /// return. Values are made by the static `New` of the concrete classes and held by shared pointers.
-/// A finished value may be read from any thread.
+/// A finished value may be read from any thread. Only memory bounds how deep values are nested.
 class ZELMAR_EXPORT MetaObject {
 public:
     /// Marks the constructors that only the `New` factories mean to call.
@@ -45,8 +45,16 @@ protected:
     // Not virtual: a value dies through the shared pointer that its factory made.
     ~MetaObject() = default;
 
-    // Lets go of a value within another one that dies. Values may be nested deeper than the stack
-    // of a thread reaches, so what dies in turn waits until this has died.
+    // For structs and lists, which may be nested deeper than the stack of a thread reaches: these
+    // need none of it for a level.
+
+    // What `IsSameStructure` of `expected` answers.
+    static bool CompareStructure(const MetaObject& expected,
+                                 const std::shared_ptr<MetaObject>& other,
+                                 std::vector<std::string>* errors);
+    // What `ToString` of the value gives.
+    static std::string NestedText(const MetaObject& value);
+    // Lets go of a value within another one that dies; what dies in turn waits until it has died.
     static void Release(std::shared_ptr<MetaObject>&& value);
 
 private:

@@ -10,12 +10,6 @@ namespace MetaObj {
 
 namespace {
 
-void Report(std::vector<std::string>* errors, std::string message) {
-    if (errors) {
-        errors->push_back(std::move(message));
-    }
-}
-
 template <class Values>
 std::shared_ptr<MetaList> ListOf(MetaType type, Values&& values) {
     auto list = MetaList::New(type);
@@ -197,57 +191,11 @@ void MetaStruct::RemoveField(const std::string& name) {
 
 bool MetaStruct::IsSameStructure(const std::shared_ptr<MetaObject>& other,
                                  std::vector<std::string>* errors) const {
-    if (!other) {
-        Report(errors, "Invalid NULL input to MetaStruct validation.");
-        return false;
-    }
-    if (other->GetType() != MetaType::Struct) {
-        Report(errors, "Type Mismatch in MetaStruct Validation: Expected type Struct got type " +
-                           MetaTypeString(other->GetType()));
-        return false;
-    }
-    const auto* input = MetaCast<MetaStruct>(other.get());
-    if (!input) {
-        Report(errors, "Unable to cast to MetaStruct, runtime error?");
-        return false;
-    }
-    if (input->_typeName != _typeName) {
-        Report(errors, "Type names do not match.");
-    }
-    const bool sameCount = input->_fields.size() == _fields.size();
-    if (!sameCount) {
-        Report(errors, "Mismatch on number of fields set in struct. Expected " +
-                           std::to_string(_fields.size()) + " found " +
-                           std::to_string(input->_fields.size()));
-    }
-    // The fields are looked at even when their count is wrong: the missing one is worth naming.
-    return FieldsMatch(*input, errors) && sameCount;
-}
-
-bool MetaStruct::FieldsMatch(const MetaStruct& other, std::vector<std::string>* errors) const {
-    for (const auto& [name, field] : _fields) {
-        const auto input = other._fields.find(name);
-        if (input == other._fields.end()) {
-            Report(errors, "Missing field in input: " + name);
-            return false;
-        }
-        const std::shared_ptr<MetaObject>& value = input->second.value;
-        if (field.value->GetType() != value->GetType() ||
-            !field.value->IsSameStructure(value, errors)) {
-            Report(errors, "Type mismatch on field: " + name);
-            return false;
-        }
-    }
-    return true;
+    return CompareStructure(*this, other, errors);
 }
 
 std::string MetaStruct::ToString() const {
-    std::string text = "{";
-    for (const auto& [name, field] : _fields) {
-        text.append("'").append(name).append("' => '").append(field.value->ToString());
-        text.append("', ");
-    }
-    return text + "}";
+    return NestedText(*this);
 }
 
 }  // namespace MetaObj

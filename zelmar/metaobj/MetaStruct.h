@@ -129,7 +129,6 @@ private:
     void Store(const std::string& name, std::shared_ptr<MetaObject> value,
                const std::string& documentation);
     void RequireNewFieldAllowed(const std::string& name) const;
-    bool FieldsMatch(const MetaStruct& other, std::vector<std::string>* errors) const;
 
     Fields _fields;
     std::shared_ptr<MetaStruct> _structureDefinition;

@@ -49,8 +49,7 @@ bool InternalPlugin::HasFormatter(const std::string& name) {
 }
 
 std::shared_ptr<Formatter> InternalPlugin::GetFormatter(const std::string& name) {
-    const auto found = std::ranges::find(
-        _formatters, name, [](const auto& formatter) { return formatter->GetName(); });
+    const auto found = std::ranges::find(_formatters, name, &Formatter::GetName);
     return found == _formatters.end() ? nullptr : *found;
 }
 

@@ -1,6 +1,7 @@
 #include <zelmar/ZelmarException.h>
 #include <zelmar/autocli/formatters/FitString.h>
 #include <zelmar/autocli/formatters/TableFormatter.h>
+#include <zelmar/internal/text/TextWriter.h>
 #include <zelmar/metaobj/MetaList.h>
 #include <zelmar/metaobj/MetaScalars.h>
 
@@ -95,7 +96,8 @@ public:
         : _list(list),
           _parameters(parameters),
           _hasFieldFormats(HasFieldFormats(parameters)),
-          _out(out) {
+          _out(out),
+          _text(out) {
         auto names = ColumnNames(*list.GetListStructure(), parameters);
         std::ranges::transform(names, names.begin(), Trimmed);
         for (const std::string& name : names) {
@@ -139,7 +141,7 @@ public:
             for (const Column& column : _columns) {
                 const auto& value = row.ValueOf(column);
                 if (wraps && column.isLast) {
-                    WriteText();
+                    _text.Finish();
                     AutoCli_FitString(static_cast<int>(startColumn), static_cast<int>(_screenWidth),
                                       value->ToString(), true, _out, false, 0, true);
                 } else {
@@ -147,8 +149,9 @@ public:
                                value->GetType() == MetaType::Int);
                 }
             }
-            EndLine();
+            _text.EndLine();
         }
+        _text.Finish();
     }
 
 private:
@@ -180,47 +183,40 @@ private:
         for (const Column& column : _columns) {
             AppendCell(column, column.name, false);
         }
-        EndLine();
+        _text.EndLine();
         if (_parameters.GetParameter("header-line") == "false") {
             return;
         }
         for (const Column& column : _columns) {
             if (!column.isLast) {
-                _line.append(column.width - columnGap, '-').append(columnGap, ' ');
+                _text.Append(std::string(column.width - columnGap, '-'));
+                _text.AppendBlanks(columnGap);
             }
         }
-        _line.append(_columns.back().name.size(), '-');
-        EndLine();
+        _text.Append(std::string(_columns.back().name.size(), '-'));
+        _text.EndLine();
     }
 
     void AppendCell(const Column& column, std::string_view text, bool isInt) {
         const size_t padding = column.width - text.size();
         if (isInt) {
-            _line.append(padding - columnGap, ' ').append(text).append(columnGap, ' ');
+            _text.AppendBlanks(padding - columnGap);
+            _text.Append(text);
+            _text.AppendBlanks(columnGap);
         } else {
-            _line.append(text).append(column.isLast ? 0 : padding, ' ');
+            _text.Append(text);
+            _text.AppendBlanks(column.isLast ? 0 : padding);
         }
-    }
-
-    void WriteText() {
-        _out.write(_line.data(), static_cast<std::streamsize>(_line.size()));
-        _line.clear();
-    }
-
-    void EndLine() {
-        _line += '\n';
-        WriteText();
-        _out.flush();
     }
 
     const MetaList& _list;
     FormatParameters& _parameters;
     const bool _hasFieldFormats;
     std::ostream& _out;
+    TextWriter _text;
     std::map<std::string, size_t> _widths;
     std::vector<Column> _columns;
     size_t _screenWidth;  // 0 when nothing is to wrap
-    std::string _line;    // what is complete of the line, not yet written
     std::string _cell;
     char _digits[24];
 };

@@ -98,8 +98,8 @@ TEST(ShellCmd, KeepsASignalThatWasWaitingBefore) {
               "Unable to write to sub-process: Broken pipe");
     sigpending(&pending);
     EXPECT_TRUE(sigismember(&pending, SIGPIPE));
-    int taken = 0;
-    sigwait(&brokenPipe, &taken);
+    const timespec atOnce = {};
+    sigtimedwait(&brokenPipe, nullptr, &atOnce);
     pthread_sigmask(SIG_UNBLOCK, &brokenPipe, nullptr);
     CollectChildren();
 }

@@ -202,6 +202,7 @@ TEST(Layout, PagesAreTheGoldenOnes) {
         {{{"fields", "Name,Size,Note"}, {"wrap-last", "true"}}, 20},
         {{{"fields", "Name,Size,Note"}, {"wrap-last", "true"}, {"units:Row.Note", "!"}}, 15},
         {{{"fields", "Name,Note"}, {"wrap-last", "true"}, {"units:Row.Note", "!"}}, 16},
+        {{{"fields", "Name,Note"}, {"wrap-last", "true"}}, 10},
         {{{"units:Row.Size", "Mb"}, {"printf:Row.Size", "%05ld"}}, 9},
         {{{"fields:Row", " \tName ,Name\r"}, {"fields", "Note"}}, 0},
         {{{"fields:row", "Size"}, {"table-columns", "Size"}, {"header-line", "false"}}, 0},

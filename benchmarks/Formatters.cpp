@@ -25,7 +25,9 @@ using List = std::shared_ptr<MetaObj::MetaList>;
 // The file is written over in place. A new one would have the kernel find and clear pages for all
 // of the text, which costs every contender the same and more than most of them take.
 std::ofstream Open(const std::string& file) {
-    std::ofstream(file, std::ios::app);  // makes it the first time
+    if (!std::filesystem::exists(file)) {
+        return std::ofstream(file);
+    }
     return std::ofstream(file, std::ios::in | std::ios::out);
 }
 

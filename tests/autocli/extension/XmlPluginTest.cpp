@@ -171,8 +171,8 @@ TEST_F(XmlPluginTest, TellsWhatIsWrong) {
                               "<meta-data><meta-data-entry>x</meta-data-entry></meta-data>",
                               "<input-spec/><output-spec><int/><bool/></output-spec>",
                               "<input-spec/><output-spec><other/></output-spec>",
-                              "<input-spec/><output-spec/><format-parameters><formatter/"
-                              "><formatter/></format-parameters>",
+                              ("<input-spec/><output-spec/>"
+                               "<format-parameters><formatter/><formatter/></format-parameters>"),
                               "<description>a</description><description>b</description>"}) {
         tell(fault, LoadCommand(fault));
     }
@@ -183,8 +183,8 @@ TEST_F(XmlPluginTest, TellsWhatIsWrong) {
           "name='nn' type='int' required='true' secret='true'><description>d</description>",
           "name='N' type='int' required='true'><description>d</description>",
           "name='nn' type='int' required='true' shortname='xy'><description>d</description>",
-          "name='nn' type='int' required='true'><description>d</description>"
-          "<constraint type='regex'><regex>x</regex></constraint>"}) {
+          ("name='nn' type='int' required='true'><description>d</description>"
+           "<constraint type='regex'><regex>x</regex></constraint>")}) {
         tell(fault, LoadCommand(std::string("<input-spec><parameter ") + fault +
                                 "</parameter></input-spec>"));
     }

@@ -57,7 +57,7 @@ std::shared_ptr<MetaList> Lists() {
     const auto listOf = [](MetaType type) {
         return std::make_shared<MetaList>(type, nullptr, MetaObj::MetaObject::FactoryFlag());
     };
-    const auto lists = listOf(MetaType::List);
+    auto lists = listOf(MetaType::List);
     for (const MetaType type : {MetaType::Bool, MetaType::Int, MetaType::String, MetaType::List,
                                 MetaType::Struct, MetaType(7)}) {
         lists->Add(listOf(type));

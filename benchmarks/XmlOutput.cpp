@@ -1,6 +1,6 @@
 // Reading a large printed document into values, beside the parser alone.
 
-#include <zelmar/internal/xml/XmlOutput.h>
+#include <zelmar/autocli/extension/XmlOutput.h>
 
 #include <libxml/parser.h>
 #include <malloc.h>

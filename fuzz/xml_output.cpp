@@ -1,7 +1,7 @@
 // What an extension process printed, up to values.
 
 #include <zelmar/ZelmarException.h>
-#include <zelmar/internal/xml/XmlOutput.h>
+#include <zelmar/autocli/extension/XmlOutput.h>
 
 #include <cstdint>
 #include <cstdlib>

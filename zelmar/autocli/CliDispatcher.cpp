@@ -1,9 +1,9 @@
 #include <zelmar/ZelmarException.h>
 #include <zelmar/autocli/CliDispatcher.h>
 #include <zelmar/autocli/OptionParser.h>
+#include <zelmar/autocli/formatters/BlockOutput.h>
 #include <zelmar/autocli/formatters/CliDispatcherHelpFormatter.h>
 #include <zelmar/internal/Ascii.h>
-#include <zelmar/internal/BlockOutput.h>
 
 #include <sys/ioctl.h>
 #include <unistd.h>

@@ -3,6 +3,8 @@
 
 #include <boost/algorithm/string/join.hpp>
 
+#include <algorithm>
+
 using CallSpec::InputSpec;
 using CallSpec::OutputSpec;
 using CallSpec::ParameterSpec;
@@ -114,6 +116,28 @@ void CommandSpec::AddExample(std::string syntax, std::string description) {
 
 void CommandSpec::AddExample(const char* syntax, const char* description) {
     _examples.emplace_back(syntax, description);
+}
+
+void CommandSpec::AddMetaData(std::string name, std::string text) {
+    _metaData.emplace_back(std::move(name), std::move(text));
+}
+
+bool CommandSpec::IsReadOnly() const {
+    return GetMetaData("read-only") == "true";
+}
+
+void CommandSpec::SetValuesSource(const std::string& parameter, std::string source) {
+    AddMetaData("values:" + parameter, std::move(source));
+}
+
+std::string CommandSpec::GetValuesSource(const std::string& parameter) const {
+    return GetMetaData("values:" + parameter);
+}
+
+std::string CommandSpec::GetMetaData(const std::string& name) const {
+    const auto found =
+        std::ranges::find(_metaData, name, &std::pair<std::string, std::string>::first);
+    return found == _metaData.end() ? "" : found->second;
 }
 
 }  // namespace AutoCli

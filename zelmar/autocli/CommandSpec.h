@@ -63,6 +63,29 @@ public:
         return _examples;
     }
 
+    /// What the command says of itself to the programs around the engine: names with texts, in the
+    /// order of their addition; a name may come again. The engine itself heeds none of them. A
+    /// descriptor's `meta-data` entries arrive here, and these names have a meaning:
+    ///
+    ///     read-only           "true": the command changes nothing
+    ///     values:<parameter>  where the values that exist are found, as `SetValuesSource` tells
+    ///     example             a further example, for reference pages: the arguments as they would
+    ///                         follow the command, " : ", and the sentence that explains them
+    void AddMetaData(std::string name, std::string text);
+    [[nodiscard]] const std::vector<std::pair<std::string, std::string>>& GetMetaData() const {
+        return _metaData;
+    }
+
+    /// Promises that the command changes nothing on the machine. False unless it was promised.
+    void SetReadOnly() { AddMetaData("read-only", "true"); }
+    [[nodiscard]] bool IsReadOnly() const;
+
+    /// Where the values that exist for a parameter are found, for completion: a command that needs
+    /// no parameter and a field of what it gives, as in "account user list:Name". Empty when
+    /// nothing was said; the first of several counts.
+    void SetValuesSource(const std::string& parameter, std::string source);
+    [[nodiscard]] std::string GetValuesSource(const std::string& parameter) const;
+
     /// Sets the help of this command as the output's value, a struct of the type
     /// `KelVashCommandHelp`, and marks the output as help. The usage shows when `input` is a
     /// `CommandInput`.
@@ -70,7 +93,10 @@ public:
                             const std::shared_ptr<CallSpec::Output>& output);
 
 private:
+    [[nodiscard]] std::string GetMetaData(const std::string& name) const;
+
     std::vector<std::pair<std::string, std::string>> _examples;
+    std::vector<std::pair<std::string, std::string>> _metaData;
     std::shared_ptr<CallSpec::InputSpec> _inputSpec;
     std::shared_ptr<CallSpec::OutputSpec> _outputSpec;
     FormatParameters _defaultFormat;

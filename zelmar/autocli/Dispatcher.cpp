@@ -1,7 +1,7 @@
 #include <zelmar/ZelmarException.h>
 #include <zelmar/autocli/Dispatcher.h>
 #include <zelmar/autocli/InternalPlugin.h>
-#include <zelmar/internal/BlockOutput.h>
+#include <zelmar/autocli/formatters/BlockOutput.h>
 #include <zelmar/internal/platform/Flagset.h>
 
 using Zelmar::ZelmarException;

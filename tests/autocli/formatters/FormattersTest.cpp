@@ -3,11 +3,11 @@
 #include <tests/support/Golden.h>
 #include <zelmar/ZelmarException.h>
 #include <zelmar/autocli/InternalPlugin.h>
+#include <zelmar/autocli/formatters/BlockOutput.h>
 #include <zelmar/autocli/formatters/JsonFormatter.h>
 #include <zelmar/autocli/formatters/PythonFormatter.h>
 #include <zelmar/autocli/formatters/SimpleFormatter.h>
 #include <zelmar/autocli/formatters/XmlFormatter.h>
-#include <zelmar/internal/BlockOutput.h>
 
 #include <gtest/gtest.h>
 

@@ -1,7 +1,7 @@
 #include "Values.h"
 
 #include <zelmar/autocli/Dispatcher.h>
-#include <zelmar/internal/xml/XmlOutput.h>
+#include <zelmar/autocli/extension/XmlOutput.h>
 
 #include <fstream>
 #include <sstream>

@@ -1,7 +1,7 @@
 #include <zelmar/ZelmarException.h>
 #include <zelmar/autocli/extension/ExtensionCommand.h>
 #include <zelmar/autocli/extension/ShellCmd.h>
-#include <zelmar/internal/xml/XmlOutput.h>
+#include <zelmar/autocli/extension/XmlOutput.h>
 
 #include <sys/wait.h>
 #include <syslog.h>

@@ -1,8 +1,8 @@
 // The templates of an extension command: which form becomes what, and how values are protected.
 
 #include <zelmar/autocli/extension/ExtensionCommand.h>
-#include <zelmar/internal/LeftoverConditions.h>
-#include <zelmar/internal/TemplateForms.h>
+#include <zelmar/autocli/extension/LeftoverConditions.h>
+#include <zelmar/autocli/extension/TemplateForms.h>
 
 #include <boost/algorithm/string/join.hpp>
 

@@ -1,9 +1,9 @@
 #include <zelmar/ZelmarException.h>
+#include <zelmar/autocli/extension/Descriptor.h>
 #include <zelmar/autocli/extension/ExtensionCommand.h>
+#include <zelmar/autocli/extension/Rethrow.h>
 #include <zelmar/autocli/extension/XmlPlugin.h>
-#include <zelmar/internal/Rethrow.h>
 #include <zelmar/internal/Split.h>
-#include <zelmar/internal/xml/Descriptor.h>
 
 #include <libxml/parser.h>
 

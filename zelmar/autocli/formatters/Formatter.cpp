@@ -1,5 +1,5 @@
 #include <zelmar/autocli/formatters/Formatter.h>
-#include <zelmar/internal/SafePrintf.h>
+#include <zelmar/autocli/formatters/SafePrintf.h>
 #include <zelmar/metaobj/MetaScalars.h>
 
 #include <algorithm>

@@ -1,6 +1,6 @@
+#include <zelmar/autocli/formatters/Escape.h>
 #include <zelmar/autocli/formatters/JsonFormatter.h>
-#include <zelmar/internal/text/Escape.h>
-#include <zelmar/internal/text/ValueWalk.h>
+#include <zelmar/autocli/formatters/ValueWalk.h>
 
 namespace AutoCli {
 

@@ -1,7 +1,7 @@
 #include <zelmar/ZelmarException.h>
+#include <zelmar/autocli/formatters/Escape.h>
 #include <zelmar/autocli/formatters/PythonFormatter.h>
-#include <zelmar/internal/text/Escape.h>
-#include <zelmar/internal/text/ValueWalk.h>
+#include <zelmar/autocli/formatters/ValueWalk.h>
 
 namespace AutoCli {
 

@@ -1,5 +1,5 @@
 #include <zelmar/autocli/formatters/SimpleFormatter.h>
-#include <zelmar/internal/text/ValueWalk.h>
+#include <zelmar/autocli/formatters/ValueWalk.h>
 
 #include <boost/algorithm/string/replace.hpp>
 #include <optional>

@@ -1,7 +1,7 @@
 #include <zelmar/ZelmarException.h>
 #include <zelmar/autocli/formatters/FitString.h>
 #include <zelmar/autocli/formatters/TableFormatter.h>
-#include <zelmar/internal/text/TextWriter.h>
+#include <zelmar/autocli/formatters/TextWriter.h>
 #include <zelmar/metaobj/MetaList.h>
 #include <zelmar/metaobj/MetaScalars.h>
 

@@ -1,6 +1,6 @@
-#include <zelmar/internal/Rethrow.h>
-#include <zelmar/internal/StreamInt.h>
-#include <zelmar/internal/xml/Descriptor.h>
+#include <zelmar/autocli/extension/Descriptor.h>
+#include <zelmar/autocli/extension/Rethrow.h>
+#include <zelmar/autocli/extension/StreamInt.h>
 
 #include <algorithm>
 

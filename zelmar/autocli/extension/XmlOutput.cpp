@@ -1,7 +1,7 @@
-#include <zelmar/internal/Rethrow.h>
-#include <zelmar/internal/StreamInt.h>
-#include <zelmar/internal/xml/XmlOutput.h>
-#include <zelmar/internal/xml/XmlUtil.h>
+#include <zelmar/autocli/extension/Rethrow.h>
+#include <zelmar/autocli/extension/StreamInt.h>
+#include <zelmar/autocli/extension/XmlOutput.h>
+#include <zelmar/autocli/extension/XmlUtil.h>
 #include <zelmar/metaobj/MetaScalars.h>
 
 #include <libxml/parser.h>

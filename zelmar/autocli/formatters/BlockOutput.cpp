@@ -1,4 +1,4 @@
-#include <zelmar/internal/BlockOutput.h>
+#include <zelmar/autocli/formatters/BlockOutput.h>
 
 namespace {
 

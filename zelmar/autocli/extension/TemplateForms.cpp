@@ -1,4 +1,4 @@
-#include <zelmar/internal/TemplateForms.h>
+#include <zelmar/autocli/extension/TemplateForms.h>
 
 #include <algorithm>
 

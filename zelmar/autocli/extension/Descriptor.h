@@ -1,7 +1,7 @@
 #pragma once
 
 #include <zelmar/autocli/CommandSpec.h>
-#include <zelmar/internal/xml/XmlUtil.h>
+#include <zelmar/autocli/extension/XmlUtil.h>
 
 #include <memory>
 #include <string>
@@ -14,9 +14,8 @@
 
 namespace AutoCli {
 
-/// Only checks, and leaves the command alone: the entries are for others than the engine. An
-/// unknown element is an error.
-void ExtractMetaData(const xmlNode* node, const CommandSpec& command);
+/// Keeps the entries with the command, for others than the engine. An unknown element is an error.
+void ExtractMetaData(const xmlNode* node, CommandSpec& command);
 
 void ExtractFormatParams(const xmlNode* node, CommandSpec& command);
 

@@ -1,5 +1,5 @@
+#include <zelmar/autocli/formatters/SafePrintf.h>
 #include <zelmar/internal/Ascii.h>
-#include <zelmar/internal/SafePrintf.h>
 
 #include <algorithm>
 #include <cerrno>

@@ -1,5 +1,5 @@
 #include <zelmar/ZelmarException.h>
-#include <zelmar/internal/xml/XmlUtil.h>
+#include <zelmar/autocli/extension/XmlUtil.h>
 
 #include <cstring>
 

@@ -3,8 +3,8 @@
 // on both sides of the position and never changes what comes after. So braces are paired once for
 // the whole text, and openings of conditions are looked up once, however often text is erased.
 
+#include <zelmar/autocli/extension/LeftoverConditions.h>
 #include <zelmar/internal/Ascii.h>
-#include <zelmar/internal/LeftoverConditions.h>
 
 #include <algorithm>
 #include <string_view>

@@ -1,6 +1,6 @@
-#include <zelmar/internal/Rethrow.h>
-#include <zelmar/internal/xml/Descriptor.h>
-#include <zelmar/internal/xml/XmlOutput.h>
+#include <zelmar/autocli/extension/Descriptor.h>
+#include <zelmar/autocli/extension/Rethrow.h>
+#include <zelmar/autocli/extension/XmlOutput.h>
 
 using CallSpec::InputSpec;
 using CallSpec::OutputSpec;
@@ -8,8 +8,8 @@ using Zelmar::ZelmarException;
 
 namespace AutoCli {
 
-void ExtractMetaData(const xmlNode* node, const CommandSpec& /*command*/) {
-    XmlUtil_ForEachChild(node, [](const xmlNode* entry) {
+void ExtractMetaData(const xmlNode* node, CommandSpec& command) {
+    XmlUtil_ForEachChild(node, [&command](const xmlNode* entry) {
         const std::string_view tag = XmlUtil_GetName(entry);
         if (!XmlUtil_IsTagged(entry)) {
             return;
@@ -22,10 +22,15 @@ void ExtractMetaData(const xmlNode* node, const CommandSpec& /*command*/) {
         bool hasContent = false;
         XmlUtil_ForEachChild(
             entry, [&](const xmlNode* child) { hasContent = hasContent || child->content; });
-        if (hasContent && XmlUtil_ExtractAttribute(entry, "name").empty()) {
+        if (!hasContent) {
+            return;
+        }
+        const std::string name = XmlUtil_ExtractAttribute(entry, "name");
+        if (name.empty()) {
             throw ZelmarException(
                 "Error parsing 'meta-data-entry', missing required attribute 'name'");
         }
+        command.AddMetaData(name, XmlUtil_GetContent(entry));
     });
 }
 

@@ -1,5 +1,5 @@
-#include <zelmar/internal/BlockOutput.h>
-#include <zelmar/internal/text/TextWriter.h>
+#include <zelmar/autocli/formatters/BlockOutput.h>
+#include <zelmar/autocli/formatters/TextWriter.h>
 
 #include <charconv>
 #include <limits>

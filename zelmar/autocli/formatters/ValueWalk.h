@@ -13,7 +13,7 @@
 // What is open stands on a stack of the walk's own and not on that of the thread, so that only
 // memory bounds how deep values are nested.
 
-#include <zelmar/internal/text/TextWriter.h>
+#include <zelmar/autocli/formatters/TextWriter.h>
 #include <zelmar/metaobj/MetaList.h>
 #include <zelmar/metaobj/MetaScalars.h>
 

@@ -2,8 +2,8 @@
 
 #include <tests/support/Split.h>
 #include <zelmar/ZelmarException.h>
-#include <zelmar/internal/StreamInt.h>
-#include <zelmar/internal/xml/XmlOutput.h>
+#include <zelmar/autocli/extension/StreamInt.h>
+#include <zelmar/autocli/extension/XmlOutput.h>
 
 #include <gtest/gtest.h>
 

@@ -8,9 +8,9 @@
 #include <string>
 
 /// Compares with the bytes of the file, which stands in the data directory of the test. After a
-/// wanted change, run with ZELMAR_UPDATE_GOLDEN=1 and read the difference with care.
+/// wanted change, run with UPDATE_GOLDEN=1 and read the difference with care.
 inline void ExpectGolden(const std::string& path, const std::string& text) {
-    if (std::getenv("ZELMAR_UPDATE_GOLDEN") != nullptr) {
+    if (std::getenv("UPDATE_GOLDEN") != nullptr) {
         std::ofstream(path, std::ios::binary) << text;
     }
     std::ostringstream golden;

@@ -200,7 +200,7 @@ TEST_F(XmlPluginTest, TellsWhatIsWrong) {
                                 "<description>d</description><constraint type=" +
                                 std::string(fault) + "</constraint></parameter></input-spec>"));
     }
-    ExpectGolden(DATA_DIR "/faults.txt", told);
+    ExpectGolden(TESTS_DIR "/autocli/extension/data/faults.txt", told);
 }
 
 TEST_F(XmlPluginTest, RefusesFilesThatAreNoDescriptors) {

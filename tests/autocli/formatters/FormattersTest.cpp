@@ -56,7 +56,7 @@ TEST(Formatters, SampleValuesGiveTheGoldenTexts) {
         for (const auto& [name, value] : SampleValues()) {
             texts += "=== " + name + "\n" + TextOf(*formatter, value);
         }
-        ExpectGolden(DATA_DIR "/" + formatter->GetName() + ".txt", texts);
+        ExpectGolden(TESTS_DIR "/autocli/formatters/data/" + formatter->GetName() + ".txt", texts);
     }
 }
 

@@ -231,7 +231,7 @@ TEST(Layout, PagesAreTheGoldenOnes) {
     page->SetField("Path", std::vector<std::string>());
     page->SetField("NamespaceNodes", "no list");
     pages += "=== listing of nothing\n" + Print<CliDispatcherHelpFormatter>(page);
-    ExpectGolden(DATA_DIR "/layout.txt", pages);
+    ExpectGolden(TESTS_DIR "/autocli/formatters/data/layout.txt", pages);
 }
 
 }  // namespace

@@ -24,7 +24,7 @@ std::string EveryByte() {
 // The values of data/values.xml, by name.
 std::shared_ptr<MetaStruct> Samples() {
     std::ostringstream document;
-    document << std::ifstream(DATA_DIR "/values.xml").rdbuf();
+    document << std::ifstream(TESTS_DIR "/autocli/formatters/data/values.xml").rdbuf();
     return std::dynamic_pointer_cast<MetaStruct>(AutoCli::XmlUtil_ParseXmlOutput(document.str()));
 }
 

@@ -12,6 +12,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <map>
 #include <sstream>
 
 #include "Values.h"
@@ -47,14 +48,34 @@ std::string TextOf(Formatter& formatter, const Value& value) {
 
 }  // namespace
 
-// data/<formatter>.txt holds the exact bytes, each value below a line "=== <its name>".
+// Of each document in XML, what stands between the lines that all have; it is empty for no value.
+std::string WithoutFrame(const std::string& text, const std::string& frame) {
+    const size_t root = frame.find("   </root>");
+    EXPECT_TRUE(text.starts_with(frame.substr(0, root)) && text.ends_with(frame.substr(root)));
+    return text.substr(root, text.size() - frame.size());
+}
+
+// data/<formatter>.txt holds the exact bytes, each value below a line "=== <its name>", and at the
+// end which values are refused.
 TEST(Formatters, SampleValuesGiveTheGoldenTexts) {
     const auto plugin = InternalPlugin::New();
     plugin->Initialize();
     for (const auto& formatter : plugin->GetFormatters()) {
+        const bool framed = formatter->GetName() == "xml";
+        const std::string frame = framed ? TextOf(*formatter, nullptr) : "";
         std::string texts;
+        std::map<std::string, std::string> refused;
         for (const auto& [name, value] : SampleValues()) {
-            texts += "=== " + name + "\n" + TextOf(*formatter, value);
+            const std::string text = TextOf(*formatter, value);
+            if (text.starts_with("throws")) {
+                refused[text] += name + ", ";
+            } else {
+                const bool cut = framed && value;
+                texts += "=== " + name + "\n" + (cut ? WithoutFrame(text, frame) : text);
+            }
+        }
+        for (const auto& [text, names] : refused) {
+            texts += "=== " + text + names + "\n";
         }
         ExpectGolden(TESTS_DIR "/autocli/formatters/data/" + formatter->GetName() + ".txt", texts);
     }
@@ -69,13 +90,13 @@ TEST(Formatters, EveryLineEndIsAFlush) {
     for (const auto& formatter : Formatters()) {
         Counter counter;
         std::ostream stream(&counter);
-        Write(*formatter, SampleValues()["nested list"], stream);
+        Write(*formatter, SampleValues()["structs"], stream);
         EXPECT_EQ(counter.flushes, std::ranges::count(counter.str(), '\n')) << formatter->GetName();
 
         counter.flushes = 0;
         {
             const BlockOutput blocks(stream);
-            Write(*formatter, SampleValues()["nested list"], stream);
+            Write(*formatter, SampleValues()["structs"], stream);
         }
         EXPECT_EQ(counter.flushes, 1) << formatter->GetName();
     }
@@ -98,6 +119,28 @@ TEST(Formatters, DepthIsBoundedByMemoryOnly) {
         Write(*formatter, value, stream);
         EXPECT_GT(counter.written, 8 * levels) << formatter->GetName();
     }
+}
+
+// What stands in front of the value where a stylesheet and parameters are given.
+TEST(Formatters, ADocumentInXmlNamesStylesheetAndParameters) {
+    auto output = CallSpec::Output::New();
+    FormatParameters parameters;
+    parameters.SetParameter("stylesheet", "s.xsl?a&b");
+    parameters.SetParameter("printf:Item.id", "<%3d>");
+    DisplayContext context;
+    std::ostringstream text;
+    EXPECT_TRUE(XmlFormatter().Format(output, parameters, context, text));
+    EXPECT_EQ(text.str(), R"(<?xml version="1.0"?>
+<?xml-stylesheet type="text/xsl" href="s.xsl?a&b"?>
+<output xmlns:kelvash="http://norvane.example/Products/TRELL/5.0/kelvash">
+   <meta-data>
+      <meta-data-field name="printf:Item.id" value="&lt;&#37;3d&gt;"/>
+      <meta-data-field name="stylesheet" value="s.xsl?a&amp;b"/>
+   </meta-data>
+   <root>
+   </root>
+</output>
+)");
 }
 
 TEST(PythonFormatter, KnowsAsciiByTheTopBit) {

@@ -20,6 +20,7 @@ int Run(int argc, char** argv) {
     program.require_subcommand(1);
     int status = EXIT_SUCCESS;
     Author::AddLint(program, status);
+    Author::AddSchema(program, status);
     try {
         program.parse(argc, argv);
     } catch (const CLI::ParseError& error) {

@@ -48,6 +48,7 @@ int main(int argc, char** argv) {
         if (std::filesystem::exists(defaultPluginDirectory, noError)) {
             dispatcher->AddDefaultDirectories();
         }
+        AutoCli::AutoCli_AnswerCompletion(*dispatcher);
         dispatcher->HandleArgvInput(argc, argv);
     } catch (const std::exception& error) {
         return ReportAndFail(error.what());

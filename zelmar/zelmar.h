@@ -17,6 +17,8 @@
 #include <zelmar/autocli/OptionParser.h>
 #include <zelmar/autocli/Plugin.h>
 #include <zelmar/autocli/SharedLibraryPlugin.h>
+#include <zelmar/autocli/completion/AnswerCompletion.h>
+#include <zelmar/autocli/completion/Completer.h>
 #include <zelmar/autocli/extension/ExtensionCommand.h>
 #include <zelmar/autocli/extension/Panic.h>
 #include <zelmar/autocli/extension/ShellCmd.h>

@@ -99,53 +99,11 @@ TEST(Tree, AFailedResolvingNamesTheLevelAndLeavesTheRest) {
               " Commands cannot have sub-commands or sub-namespaces. | x y");
 }
 
-TEST(Tree, ARefusedRegistrationChangesNothing) {
-    const Tree tree;
-    const auto refusal = [&tree](const std::shared_ptr<NamespaceNode>& node, const char* name) {
-        return Thrown([&] { tree.a->RegisterNamespaceNode(node, name); });
-    };
-    const auto free = Namespace::New();
-    EXPECT_EQ(refusal(nullptr, "b"),
-              "Duplicate registration in namespace a attempt to register two objects with name b");
-    EXPECT_EQ(refusal(nullptr, "c"), "Null namespace node named 'c' passed to namespace a");
-    EXPECT_EQ(refusal(free, "C"),
-              "Invalid name for namespace 'C', must be a name consisting of letters and numbers and"
-              " must conform to 'camel' casing.");
-    EXPECT_EQ(free->GetParent(), nullptr);
-    EXPECT_EQ(tree.a->GetNamespaceNodeNames(), Names({"b", "cmd"}));
-}
-
 TEST(Tree, ACommandHasNoChildren) {
     const Tree tree;
-    const std::string noNode =
-        "Unable to find a namespace or command with the name 'x' on the command 'a cmd'. Commands"
-        " cannot have sub-commands or sub-namespaces.";
-    EXPECT_EQ(Thrown([&] { (void)tree.command->GetNamespaceNode("x"); }), noNode);
-    EXPECT_EQ(Thrown([&] { (void)tree.command->SubNamespace("x"); }), noNode);
-    EXPECT_EQ(Thrown([&] { tree.command->RegisterNamespaceNode(nullptr, "x"); }),
-              "Attempt to register a command or namespace 'x' on command 'a cmd'. Commands cannot"
-              " have sub-commands or sub-namespaces.");
     EXPECT_FALSE(tree.command->HasNamespaceNode("x"));
     EXPECT_EQ(tree.command->GetNamespaceNodeNames(), Names());
     EXPECT_EQ(tree.a->SubNamespace("cmd"), tree.command);
-}
-
-TEST(Tree, AFreeNodeKnowsNeitherPathNorDispatcher) {
-    const auto node = Namespace::New();
-    const auto command = TestCommand::New();
-    node->SetName("free");
-    node->RegisterNamespaceNode(command, "cmd");
-    const std::string state =
-        ": Invalid state for Namespace Node with the name 'free' No parent node has been set";
-    EXPECT_EQ(Thrown([&] { (void)command->GetPath(); }), "GetPath" + state);
-    EXPECT_EQ(Thrown([&] { (void)command->GetPathString(' '); }), "GetPathString" + state);
-    EXPECT_EQ(Thrown([&] { (void)command->GetDispatcher(); }),
-              "Invalid state for namespace 'freeno parent has been set while attempting to get"
-              " dispathcer reference.");
-    EXPECT_EQ(Thrown([&] { (void)TestCommand::New()->GetDispatcher(); }),
-              "Invalid state for command with name ''. No parent node has been set.");
-    EXPECT_EQ(Thrown([&] { RootNamespace::New(nullptr)->SetParent(node); }),
-              "Error, Root namespace cannot be assigned a parent node");
 }
 
 }  // namespace

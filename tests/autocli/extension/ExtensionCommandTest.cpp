@@ -1,5 +1,4 @@
 #include <tests/support/Split.h>
-#include <tests/support/Thrown.h>
 #include <zelmar/autocli/extension/ExtensionCommand.h>
 #include <zelmar/metaobj/MetaObject.h>
 
@@ -107,14 +106,6 @@ TEST_F(ExtensionCommandTest, TellsTheProcessWhoAsksWhenItWantsToKnow) {
     EXPECT_EQ(Execute(print), "[o'neil][en_US.UTF-8]");
     _input->SetContext("user", "");
     EXPECT_EQ(Execute(print), "[en_US.UTF-8]");
-}
-
-TEST_F(ExtensionCommandTest, IsIncompleteWithoutItsDeclarations) {
-    const auto command = ExtensionCommand::New();
-    EXPECT_EQ(Thrown([&] { command->GetInputSpec(); }),
-              "Request for NULL InputSpec.  Extension command is incomplete and will not work");
-    EXPECT_EQ(Thrown([&] { command->GetOutputSpec(); }),
-              "Request for NULL OutputSpec.  Extension command is incomplete and will not work");
 }
 
 // Single quotes hold any value together, at the price of the single quotes in it.

@@ -29,6 +29,7 @@
 #include <zelmar/autocli/formatters/FormatParameters.h>
 #include <zelmar/autocli/formatters/Formatter.h>
 #include <zelmar/autocli/formatters/JsonFormatter.h>
+#include <zelmar/autocli/formatters/JsonText.h>
 #include <zelmar/autocli/formatters/PythonFormatter.h>
 #include <zelmar/autocli/formatters/SimpleFormatter.h>
 #include <zelmar/autocli/formatters/TableFormatter.h>

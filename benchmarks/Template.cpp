@@ -2,6 +2,7 @@
 
 #include <zelmar/autocli/extension/ExtensionCommand.h>
 
+#include "Memory.h"
 #include "Paired.h"
 
 using CallSpec::ParameterSpec;
@@ -44,9 +45,28 @@ std::function<void()> Expanding(size_t blanks) {
     };
 }
 
+// A script of 50 MB as a value, beside what the line that comes out of it takes.
+void PrintMemoryOfLargeValue() {
+    std::string value;
+    while (value.size() < 50'000'000) {
+        value += "if [ -n \"${name}\" ]; then { echo $name; }; fi\n";
+    }
+    Call call = MakeCall(1);
+    call.command->SetStdin("$val{parameter-0} $if{parameter-1,x}");
+    call.input = CallSpec::Input::New();
+    call.input->AddParameter("parameter-0", value);
+    call.input->SetInputSpec(call.command->GetInputSpec());
+    size_t size = 0;
+    const long growth =
+        Memory::GrowthWhile([&] { size = call.command->SubstituteInput(call.input, true).size(); });
+    std::printf("memory for a value of 50 MB, by the byte of the text%34.2f  at most 4\n\n",
+                1024.0 * static_cast<double>(growth) / static_cast<double>(size));
+}
+
 }  // namespace
 
 int main() {
+    PrintMemoryOfLargeValue();
     Paired::Compare("expanding a template of 40 forms, by the KB", 31,
                     {{.name = "of 10 KB", .run = Expanding(1000), .times = calls * 10},
                      {"of 100 KB", Expanding(10000), "constant", calls * 100},

@@ -38,27 +38,34 @@ TEST(HostMounts, EveryLineOfTheTableIsAMountWithItsNamesDecoded) {
     EXPECT_EQ(Print(mounts[1]), "|/mnt/no source|tmpfs|ro");
     EXPECT_EQ(Print(mounts[2]), "//nas/share\\x|/mnt/tab\tline\nend|cifs|rw|user=\\\\1");
     EXPECT_EQ(Print(mounts[3]), "cut|short|");
+    std::ifstream folder("/");
+    EXPECT_TRUE(ReadMounts(folder).empty() && folder.bad());
 }
 
-// A file system of 10 MiB, but for one that is gone and one whose server never answers.
+// A file system of 10 MiB, but for one that is gone, one whose server never answers, and one that
+// costs the asking process its life.
 Capacity MeasureInTest(const char* path) {
     if (std::string_view(path) == "/stuck") {
         pause();
+    }
+    if (std::string_view(path) == "/deadly") {
+        _exit(1);
     }
     return std::string_view(path) == "/gone" ? Capacity{.error = ENOENT} : Capacity{.size = 10};
 }
 
 TEST(HostMounts, AMountThatHangsOrFailsLeavesTheOthersTheirSizes) {
     std::vector<std::pair<long, int>> measured;
-    std::vector<Mount> mounts(5);
-    for (size_t i = 0; const char* path : {"/a", "/stuck", "/gone", "/stuck", "/b"}) {
+    std::vector<Mount> mounts(6);
+    for (size_t i = 0; const char* path : {"/a", "/stuck", "/gone", "/deadly", "/stuck", "/b"}) {
         mounts[i++].path = path;
     }
     for (const Capacity& capacity : MeasureMounts(mounts, milliseconds(200), &MeasureInTest)) {
         measured.emplace_back(capacity.size, capacity.error);
     }
-    EXPECT_EQ(measured, (std::vector<std::pair<long, int>>{
-                            {10, 0}, {0, ETIMEDOUT}, {0, ENOENT}, {0, ETIMEDOUT}, {10, 0}}));
+    EXPECT_EQ(measured,
+              (std::vector<std::pair<long, int>>{
+                  {10, 0}, {0, ETIMEDOUT}, {0, ENOENT}, {0, EPIPE}, {0, ETIMEDOUT}, {10, 0}}));
     EXPECT_EQ(waitpid(-1, nullptr, WNOHANG), -1) << "a child is left";
 }
 

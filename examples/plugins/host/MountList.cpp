@@ -116,11 +116,11 @@ std::shared_ptr<OutputSpec> MountList::GetOutputSpecInternal() {
 void MountList::ExecuteInternal(const std::shared_ptr<Input>& input,
                                 const std::shared_ptr<Output>& output) {
     std::ifstream table(mountTable);
-    if (!table) {
+    std::vector<Mount> mounts = ReadMounts(table);
+    if (!table.is_open() || table.bad()) {
         output->AddErrorMessage(std::string("Unable to read ") + mountTable);
         return;
     }
-    std::vector<Mount> mounts = ReadMounts(table);
     if (input->HasParameter("type")) {
         const std::string& type = input->GetParameter("type");
         std::erase_if(mounts, [&](const Mount& mount) { return mount.type != type; });

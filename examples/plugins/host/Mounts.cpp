@@ -83,13 +83,19 @@ public:
         }
     }
 
+    // The next capacity. False when the child sent none; its error then tells why.
     bool Receive(Capacity& capacity, milliseconds patience) const {
         pollfd answers = {_answers, POLLIN, 0};
         int ready = -1;
         do {
             ready = poll(&answers, 1, static_cast<int>(patience.count()));
         } while (ready < 0 && errno == EINTR);
-        return ready == 1 && read(_answers, &capacity, sizeof capacity) == sizeof capacity;
+        const ssize_t count = ready > 0 ? read(_answers, &capacity, sizeof capacity) : ready;
+        if (count == sizeof capacity) {
+            return true;
+        }
+        capacity = {.error = count < 0 ? errno : ready == 0 ? ETIMEDOUT : EPIPE};
+        return false;
     }
 
 private:
@@ -146,12 +152,9 @@ std::vector<Capacity> MeasureMounts(const std::vector<Mount>& mounts, millisecon
     while (capacities.size() < mounts.size()) {
         // Each further child goes on behind the mount on which the one before it got stuck.
         const Surveyor surveyor(mounts.data() + capacities.size(), end, measure);
-        Capacity capacity;
-        while (capacities.size() < mounts.size() && surveyor.Receive(capacity, patience)) {
-            capacities.push_back(capacity);
-        }
-        if (capacities.size() < mounts.size()) {
-            capacities.push_back({.error = ETIMEDOUT});
+        bool answers = true;
+        while (answers && capacities.size() < mounts.size()) {
+            answers = surveyor.Receive(capacities.emplace_back(), patience);
         }
     }
     return capacities;

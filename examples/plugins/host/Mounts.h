@@ -15,7 +15,8 @@ struct Mount {
     std::vector<std::string> options;
 };
 
-/// Reads a table in the form of /proc/self/mounts, where a blank in a name stands as "\040".
+/// Reads a table in the form of /proc/self/mounts, where a blank in a name stands as "\040". A read
+/// that fails ends it like the end of the table, and leaves the stream bad.
 std::vector<Mount> ReadMounts(std::istream& table);
 
 /// The sizes of a file system in MiB; all are 0 when there is an error.
@@ -29,7 +30,8 @@ struct Capacity {
 Capacity MeasureMount(const char* path);
 
 /// The capacity of each mount, in the same order. One that does not answer within `patience`, as
-/// when the server behind it is gone, gets the error ETIMEDOUT. Throws `std::system_error` when
+/// when the server behind it is gone, gets the error ETIMEDOUT, and one at which the process that
+/// asks for it dies, EPIPE. Throws `std::system_error` when
 /// the system is out of processes or descriptors.
 std::vector<Capacity> MeasureMounts(const std::vector<Mount>& mounts,
                                     std::chrono::milliseconds patience,

@@ -4,6 +4,8 @@
 
 #include <gtest/gtest.h>
 
+#include <syslog.h>
+
 #include <algorithm>
 #include <cstdlib>
 #include <optional>
@@ -82,7 +84,15 @@ TEST_F(ExtensionCommandTest, ReportsAProcessThatPrintsNothing) {
     EXPECT_EQ(Execute("exit 7"), report("exit 7", "7"));
     EXPECT_EQ(Execute("kill -9 $$"), report("kill -9 $$", "137"));
     unsetenv("LANG");
-    EXPECT_EQ(Execute("true"), report("LANG=en_US.UTF-8 true", "0"));
+    const std::string percent = report("LANG=en_US.UTF-8 true %d", "0");
+    openlog("log", LOG_PERROR, LOG_USER);
+    setlogmask(LOG_MASK(LOG_ERR));
+    testing::internal::CaptureStderr();
+    EXPECT_EQ(Execute("true %d"), percent);
+    EXPECT_EQ("[" + testing::internal::GetCapturedStderr(),
+              "[log: " + percent.substr(1, percent.size() - 2) + "\n");
+    setlogmask(LOG_UPTO(LOG_DEBUG));
+    closelog();
 }
 
 TEST_F(ExtensionCommandTest, ReportsOutputThatDoesNotBuild) {
@@ -95,6 +105,14 @@ TEST_F(ExtensionCommandTest, ReportsOutputThatDoesNotBuild) {
     EXPECT_EQ(Execute("echo '<o><int>1</int>'"), "");  // and no value: the declared output tells
     EXPECT_EQ(Execute("head -c 100000 /dev/urandom"), "");
     EXPECT_NE(testing::internal::GetCapturedStderr().find("STDOUT:"), std::string::npos);
+}
+
+TEST_F(ExtensionCommandTest, NamesTheSignalThatEndedAnUnfinishedOutput) {
+    testing::internal::CaptureStderr();
+    EXPECT_EQ(Execute("echo '<o><int>1</int>'; kill -9 $$"),
+              "[The process of this command was ended by signal 9 (Killed)]");
+    testing::internal::GetCapturedStderr();
+    EXPECT_EQ(Execute("echo '<o><int>1</int></o>'; kill -9 $$"), "1");
 }
 
 TEST_F(ExtensionCommandTest, TellsTheProcessWhoAsksWhenItWantsToKnow) {

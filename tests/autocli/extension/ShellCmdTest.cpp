@@ -6,6 +6,7 @@
 
 #include <fcntl.h>
 #include <sys/resource.h>
+#include <sys/time.h>
 #include <sys/wait.h>
 
 #include <csignal>
@@ -41,9 +42,8 @@ long CountInheritable() {
     return count;
 }
 
-void CollectChildren() {
-    while (waitpid(-1, nullptr, 0) > 0) {
-    }
+bool HasChild() {
+    return waitpid(-1, nullptr, WNOHANG) >= 0;
 }
 
 constexpr size_t megabyte = 1 << 20;
@@ -84,7 +84,22 @@ TEST(ShellCmd, ReportsAnInputThatNobodyReadsAndLeavesSignalsAlone) {
     EXPECT_FALSE(sigismember(&signals, SIGPIPE));
     sigpending(&signals);
     EXPECT_FALSE(sigismember(&signals, SIGPIPE));
-    CollectChildren();
+    EXPECT_FALSE(HasChild());
+}
+
+// Calls that wait are cut short every millisecond, in each of the places where one waits.
+TEST(ShellCmd, GoesOnAfterASignal) {
+    struct sigaction before = {};
+    struct sigaction tick = {};
+    tick.sa_handler = IgnoreSignal;
+    sigaction(SIGALRM, &tick, &before);
+    const itimerval fast = {{0, 1000}, {0, 1000}};
+    const itimerval never = {};
+    setitimer(ITIMER_REAL, &fast, nullptr);
+    EXPECT_EQ(Shell("sleep 0.02; cat; exec >&-; sleep 0.02", std::string(megabyte, 'x')).size(),
+              megabyte);
+    setitimer(ITIMER_REAL, &never, nullptr);
+    sigaction(SIGALRM, &before, nullptr);
 }
 
 TEST(ShellCmd, KeepsASignalThatWasWaitingBefore) {
@@ -101,7 +116,6 @@ TEST(ShellCmd, KeepsASignalThatWasWaitingBefore) {
     const timespec atOnce = {};
     sigtimedwait(&brokenPipe, nullptr, &atOnce);
     pthread_sigmask(SIG_UNBLOCK, &brokenPipe, nullptr);
-    CollectChildren();
 }
 
 TEST(ShellCmd, LeaksNoDescriptorToAnyone) {
@@ -111,7 +125,21 @@ TEST(ShellCmd, LeaksNoDescriptorToAnyone) {
     Shell(deafCommand, std::string(megabyte, 'x'));
     Shell(std::string(megabyte, ' '));
     EXPECT_EQ(CountDescriptors(), before);
-    CollectChildren();
+}
+
+TEST(ShellCmd, NeedsLittleStack) {
+    pthread_attr_t attributes;
+    pthread_attr_init(&attributes);
+    pthread_attr_setstacksize(&attributes, 65536);
+    std::string printed;
+    pthread_t thread = {};
+    const auto run = [](void* text) -> void* {
+        *static_cast<std::string*>(text) = Shell("cat", "x");
+        return nullptr;
+    };
+    ASSERT_EQ(pthread_create(&thread, &attributes, run, &printed), 0);
+    pthread_join(thread, nullptr);
+    EXPECT_EQ(printed, "x");
 }
 
 TEST(ShellCmd, TellsWhyTheShellDoesNotStart) {

@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <cstdlib>
+#include <cstring>
 #include <string_view>
 
 using CallSpec::Input;
@@ -45,7 +46,7 @@ void AddErrorLines(std::string_view printed, Output& output) {
     }
 }
 
-void SetValue(std::string_view printed, Output& output) {
+void SetValue(std::string_view printed, int status, Output& output) {
     try {
         if (const auto value = XmlUtil_ParseXmlOutput(printed)) {
             output.SetRootObject(value);
@@ -53,6 +54,11 @@ void SetValue(std::string_view printed, Output& output) {
     } catch (const ZelmarException& error) {
         output.AddErrorMessage(std::string("Unable to parse output of Extension Command: ") +
                                error.what());
+    }
+    if (WIFSIGNALED(status) && !output.GetRootObject()) {
+        const int signal = WTERMSIG(status);
+        output.AddErrorMessage("The process of this command was ended by signal " +
+                               std::to_string(signal) + " (" + strsignal(signal) + ")");
     }
 }
 
@@ -99,7 +105,7 @@ void ExtensionCommand::ExecuteInternal(const std::shared_ptr<Input>& input,
     }
     AddErrorLines(printed, *output);
     if (!output->HasError()) {
-        SetValue(printed, *output);
+        SetValue(printed, status, *output);
     }
 }
 

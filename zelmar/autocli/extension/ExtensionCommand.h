@@ -63,15 +63,6 @@ public:
     [[nodiscard]] std::string SanitizeChar(const std::string& value, char c) const;
 
 private:
-    void SubstituteParameter(std::string& text, const CallSpec::Input& input,
-                             const std::string& name, bool isStdin) const;
-    [[nodiscard]] std::string JoinedList(const CallSpec::Input& input, const std::string& name,
-                                         const std::string& separator, bool quote,
-                                         bool isStdin) const;
-    [[nodiscard]] std::string RepeatedList(const CallSpec::Input& input, const std::string& name,
-                                           const std::string& prefix, bool quote,
-                                           bool isStdin) const;
-
     std::shared_ptr<CallSpec::InputSpec> _extensionInputSpec;
     std::shared_ptr<CallSpec::OutputSpec> _extensionOutputSpec;
     std::string _executeCommand;

@@ -10,12 +10,90 @@ using CallSpec::Input;
 
 namespace AutoCli {
 
+namespace {
+
+std::string Escape(const std::string& value) {
+    std::string escaped;
+    escaped.reserve(value.size());
+    for (const char c : value) {
+        if (isBadChar(c)) {
+            escaped += '\\';
+        }
+        escaped += c;
+    }
+    return escaped;
+}
+
+std::string Without(std::string value, char c) {
+    std::erase(value, c);
+    return value;
+}
+
+std::vector<std::string> ValuesOf(const Input& input, const std::string& name) {
+    std::vector<std::string> values;
+    input.GetParameterList(name, values);
+    return values;
+}
+
+// Replaces the forms of one parameter that was given.
+class Substitution {
+public:
+    Substitution(const Input& input, const std::string& name, bool isStdin)
+        : _input(input), _name(name), _isStdin(isStdin) {}
+
+    void Run(std::string& text) const {
+        ReplaceValues(text, _name, [this](bool isQuoted) { return Value(isQuoted); });
+        ReplaceConditions(text, _name);
+        ReplaceJoinedLists(text, _name, [this](std::string_view separator, bool quote) {
+            return JoinedList(separator, quote);
+        });
+        ReplaceRepeatedLists(text, _name, [this](std::string_view prefix, bool quote) {
+            return RepeatedList(prefix, quote);
+        });
+    }
+
+private:
+    [[nodiscard]] std::string Protected(const std::string& value) const {
+        return _isStdin ? value : Escape(value);
+    }
+
+    [[nodiscard]] std::string Unquoted(const std::string& value, char quote) const {
+        return _isStdin ? value : Without(value, quote);
+    }
+
+    [[nodiscard]] std::string Value(bool isQuoted) const {
+        const std::string& value = _input.GetParameter(_name);
+        return isQuoted ? Unquoted(value, '\'') : Protected(value);
+    }
+
+    [[nodiscard]] std::string JoinedList(std::string_view separator, bool quote) const {
+        const std::string list =
+            Protected(boost::algorithm::join(ValuesOf(_input, _name), separator));
+        return quote ? '"' + list + '"' : list;
+    }
+
+    [[nodiscard]] std::string RepeatedList(std::string_view prefix, bool quote) const {
+        std::string list;
+        for (const std::string& value : ValuesOf(_input, _name)) {
+            list.append(" ").append(prefix).append(" ");
+            list.append(quote ? '"' + Unquoted(value, '"') + '"' : Protected(value));
+        }
+        return list;
+    }
+
+    const Input& _input;
+    const std::string& _name;
+    const bool _isStdin;
+};
+
+}  // namespace
+
 std::string ExtensionCommand::SubstituteInput(const std::shared_ptr<Input>& input, bool isStdin) {
     std::string text = isStdin ? _stdin : _executeCommand;
     if (text.find('$') != std::string::npos) {
         for (const auto& parameter : GetInputSpec()->GetParameterSpecs()) {
             if (input->HasParameter(parameter->GetName())) {
-                SubstituteParameter(text, *input, parameter->GetName(), isStdin);
+                Substitution(*input, parameter->GetName(), isStdin).Run(text);
             }
         }
         RemoveLeftoverConditions(text);
@@ -24,70 +102,12 @@ std::string ExtensionCommand::SubstituteInput(const std::shared_ptr<Input>& inpu
     return text;
 }
 
-void ExtensionCommand::SubstituteParameter(std::string& text, const Input& input,
-                                           const std::string& name, bool isStdin) const {
-    if (const auto last = FindLastValue(text, name)) {
-        const std::string& value = input.GetParameter(name);
-        ReplaceValues(text, name,
-                      isStdin          ? value
-                      : last->isQuoted ? SanitizeChar(value, '\'')
-                                       : SanitizeInput(value));
-    }
-    ReplaceConditions(text, name);
-    if (const auto list = FindLastJoinedList(text, name)) {
-        ReplaceJoinedLists(text, name, JoinedList(input, name, list->text, list->quote, isStdin));
-    }
-    if (const auto list = FindLastRepeatedList(text, name)) {
-        ReplaceRepeatedLists(text, name,
-                             RepeatedList(input, name, list->text, list->quote, isStdin));
-    }
-}
-
-std::string ExtensionCommand::JoinedList(const Input& input, const std::string& name,
-                                         const std::string& separator, bool quote,
-                                         bool isStdin) const {
-    std::vector<std::string> values;
-    input.GetParameterList(name, values);
-    std::string list = boost::algorithm::join(values, separator);
-    if (!isStdin) {
-        list = SanitizeInput(list);
-    }
-    return quote ? '"' + list + '"' : list;
-}
-
-std::string ExtensionCommand::RepeatedList(const Input& input, const std::string& name,
-                                           const std::string& prefix, bool quote,
-                                           bool isStdin) const {
-    std::vector<std::string> values;
-    input.GetParameterList(name, values);
-    std::string list;
-    for (const std::string& value : values) {
-        list.append(" ").append(prefix).append(" ");
-        if (quote) {
-            list.append("\"").append(isStdin ? value : SanitizeChar(value, '"')).append("\"");
-        } else {
-            list.append(isStdin ? value : SanitizeInput(value));
-        }
-    }
-    return list;
-}
-
 std::string ExtensionCommand::SanitizeInput(const std::string& value) const {
-    std::string sanitized;
-    sanitized.reserve(value.size());
-    for (const char c : value) {
-        if (isBadChar(c)) {
-            sanitized += '\\';
-        }
-        sanitized += c;
-    }
-    return sanitized;
+    return Escape(value);
 }
 
 std::string ExtensionCommand::SanitizeChar(const std::string& value, char c) const {
-    std::string sanitized = value;
-    std::erase(sanitized, c);
-    return sanitized;
+    return Without(value, c);
 }
 
 bool isBadChar(char c) {

@@ -1,8 +1,9 @@
-// One pass from left to right, whose position always stands at a `{`. What is in front of it has
-// been moved to `_done`; what follows it is still the end of `_text`, since erasing takes away text
-// on both sides of the position and never changes what comes after. So braces are paired once for
-// the whole text, and openings of conditions are looked up once, however often text is erased.
+// One pass from left to right, in place. The position always stands at a `{`; what is in front of
+// it and stays has been moved to the front of the text, and what follows it has not been touched,
+// since erasing takes away text on both sides of the position and never changes what comes after.
+// So whether a brace is closed is found out once for the whole text.
 
+#include <zelmar/autocli/extension/ExtensionCommand.h>
 #include <zelmar/autocli/extension/LeftoverConditions.h>
 #include <zelmar/internal/Ascii.h>
 
@@ -47,77 +48,99 @@ Opening FindOpening(std::string_view text, size_t from) {
     return {};
 }
 
-// For each `{` the place of the `}` that pairs with it.
-std::vector<size_t> PairBraces(std::string_view text) {
-    std::vector<size_t> closes(text.size(), npos);
-    std::vector<size_t> open;
-    for (size_t i = 0; i < text.size(); ++i) {
-        if (text[i] == '{') {
-            open.push_back(i);
-        } else if (text[i] == '}' && !open.empty()) {
-            closes[open.back()] = i;
-            open.pop_back();
+// Which braces are open to the end: a bit for each character.
+std::vector<bool> FindUnclosed(std::string_view text) {
+    std::vector<bool> unclosed(text.size());
+    size_t closes = 0;
+    for (size_t i = text.size(); i-- > 0;) {
+        if (text[i] == '}') {
+            ++closes;
+        } else if (text[i] == '{') {
+            unclosed[i] = closes == 0;
+            closes -= closes == 0 ? 0 : 1;
         }
     }
-    return closes;
+    return unclosed;
 }
 
 class Remover {
 public:
-    explicit Remover(std::string_view text)
-        : _text(text), _closes(PairBraces(text)), _opening(FindOpening(text, 0)) {}
+    explicit Remover(std::string& text)
+        : _text(text), _unclosed(FindUnclosed(text)), _opening(FindOpening(text, 0)) {}
 
-    std::string Run() {
+    void Run() {
         KeepUpToBrace();
         while (_next < _text.size()) {
-            const size_t close = _closes[_next];
-            if (close == npos) {
+            if (_unclosed[_next]) {
                 Keep(1);
-            } else if (HoldsCondition(close)) {
-                EraseThrough(close);
             } else {
-                Keep(close + 1 - _next);
+                VisitPair();
             }
             KeepUpToBrace();
         }
-        return std::move(_done);
+        _text.resize(_done);
     }
 
 private:
+    // A `$` in what is kept, which was the nearest to the position when a pair was visited.
     struct Dollar {
         size_t place;
+        size_t searchedFrom;
         bool isPlain = false;  // opens no condition in front of the position
     };
 
     void Keep(size_t count) {
-        const std::string_view kept = _text.substr(_next, count);
-        for (size_t i = kept.find('$'); i != npos; i = kept.find('$', i + 1)) {
-            _dollars.push_back({_done.size() + i});
+        if (_done != _next) {
+            std::copy_n(_text.begin() + static_cast<long>(_next), count,
+                        _text.begin() + static_cast<long>(_done));
         }
-        _done.append(kept);
-        _next += kept.size();
+        _done += count;
+        _next += count;
     }
 
     void KeepUpToBrace() { Keep(std::min(_text.find('{', _next), _text.size()) - _next); }
 
+    void VisitPair() {
+        const size_t size = FindPairedTokenSize(_text.data(), _next, _text.size(), '{', '}').second;
+        if (FindDollar() && HoldsCondition(_next + size - 1)) {
+            EraseThrough(_next + size);
+        } else {
+            Keep(size);
+        }
+    }
+
+    [[nodiscard]] std::string_view Kept() const { return std::string_view(_text).substr(0, _done); }
+
+    // Looks for the nearest `$` in what was kept since the last look.
+    bool FindDollar() {
+        const size_t place = Kept().substr(_searched).rfind('$');
+        if (place != npos) {
+            _dollars.push_back({_searched + place, _searched});
+        }
+        _searched = _done;
+        return !_dollars.empty();
+    }
+
     // The text after the erased one moves down, and the position does not move with it.
-    void EraseThrough(size_t close) {
-        const size_t passed = _done.size() - _dollars.back().place;
-        _done.resize(_dollars.back().place);
+    void EraseThrough(size_t end) {
+        const Dollar dollar = _dollars.back();
         _dollars.pop_back();
-        _next = close + 1;
-        Keep(passed);
+        const size_t passed = _done - dollar.place;
+        _done = dollar.place;
+        _searched = dollar.searchedFrom;
+        _next = end;
+        Keep(std::min(passed, _text.size() - end));
     }
 
     // Is there a condition in the text from the nearest `$` to the end of the pair?
     bool HoldsCondition(size_t close) {
-        return !_dollars.empty() && (OpensBefore() || OpensAtPosition(close) || OpensInside(close));
+        return OpensBefore() || OpensAtPosition(close) || OpensInside(close);
     }
 
     // `$if{<name>,` is over before the position. It then closes with the pair.
     bool OpensBefore() {
         Dollar& dollar = _dollars.back();
-        const std::string_view lead = std::string_view(_done).substr(dollar.place);
+        const std::string_view lead = Kept().substr(dollar.place);
         if (dollar.isPlain || lead == "$if") {
             return false;
         }
@@ -127,7 +150,7 @@ private:
 
     // The brace of `$if{<name>,` is the one at the position.
     [[nodiscard]] bool OpensAtPosition(size_t close) const {
-        if (!_done.ends_with("$if")) {
+        if (!Kept().ends_with("$if")) {
             return false;
         }
         const size_t body = BodyAfterName(_text, _next + 1);
@@ -142,12 +165,13 @@ private:
         return _opening.place < close;
     }
 
-    std::string_view _text;
-    std::vector<size_t> _closes;
+    std::string& _text;
+    std::vector<bool> _unclosed;
     Opening _opening;  // the first one at or behind the position, once it was asked for
     size_t _next = 0;
-    std::string _done;
-    std::vector<Dollar> _dollars;  // of `_done`
+    size_t _done = 0;      // the end of what is kept
+    size_t _searched = 0;  // up to here, each pair's nearest `$` is known
+    std::vector<Dollar> _dollars;
 };
 
 }  // namespace
@@ -156,7 +180,7 @@ void RemoveLeftoverConditions(std::string& text) {
     const Opening first = FindOpening(text, 0);
     const size_t lastClose = text.rfind('}');
     if (first.place != npos && lastClose != npos && first.body < lastClose) {
-        text = Remover(text).Run();
+        Remover(text).Run();
     }
 }
 

@@ -69,11 +69,10 @@ void Feed(FileDescriptor& pipe, std::string_view& text) {
 }
 
 // Appends what the pipe holds now, and closes it when nothing more can come.
-void Drain(FileDescriptor& pipe, std::string& text) {
-    char block[65536];
-    const ssize_t count = read(pipe.Get(), block, sizeof block);
+void Drain(FileDescriptor& pipe, std::vector<char>& block, std::string& text) {
+    const ssize_t count = read(pipe.Get(), block.data(), block.size());
     if (count > 0) {
-        text.append(block, static_cast<size_t>(count));
+        text.append(block.data(), static_cast<size_t>(count));
     } else if (count == 0) {
         pipe.Close();
     } else if (!IsWorthRepeating()) {
@@ -84,6 +83,7 @@ void Drain(FileDescriptor& pipe, std::string& text) {
 // Both directions at once: a process may print more than a pipe holds before it has read its input.
 void Pump(FileDescriptor& input, std::string_view inputText, FileDescriptor& output,
           std::string& outputText) {
+    std::vector<char> block(65536);  // as much as a pipe holds, and more than a small stack does
     while (input.Get() >= 0 || output.Get() >= 0) {
         pollfd ends[] = {{input.Get(), POLLOUT, 0}, {output.Get(), POLLIN, 0}};
         if (poll(ends, std::size(ends), -1) < 0 && !IsWorthRepeating()) {
@@ -93,19 +93,19 @@ void Pump(FileDescriptor& input, std::string_view inputText, FileDescriptor& out
             Feed(input, inputText);
         }
         if (ends[1].revents != 0) {
-            Drain(output, outputText);
+            Drain(output, block, outputText);
         }
     }
 }
 
-int WaitFor(int processId, const std::string& command) {
-    int status = 0;
+// False, with the reason in `errno`, when the process cannot be waited for.
+bool WaitFor(int processId, int& status) {
     while (waitpid(processId, &status, 0) < 0) {
         if (errno != EINTR) {
-            throw SystemFailure("Error waiting for process '" + command + "'");
+            return false;
         }
     }
-    return status;
+    return true;
 }
 
 }  // namespace
@@ -128,8 +128,18 @@ int AutoCli_ShellCmd(const std::string& command, std::string& output, const std:
     inputPipe.readEnd.Close();
     outputPipe.writeEnd.Close();
 
-    Pump(inputPipe.writeEnd, unwritten, outputPipe.readEnd, output);
-    const int status = WaitFor(processId, command);
+    int status = 0;
+    try {
+        Pump(inputPipe.writeEnd, unwritten, outputPipe.readEnd, output);
+    } catch (...) {
+        inputPipe.writeEnd.Close();
+        outputPipe.readEnd.Close();
+        WaitFor(processId, status);
+        throw;
+    }
+    if (!WaitFor(processId, status)) {
+        throw SystemFailure("Error waiting for process '" + command + "'");
+    }
     if (commandExecListener) {
         commandExecListener(command, status);
     }

@@ -14,9 +14,11 @@ namespace AutoCli {
 ///
 /// Throws `ZelmarException`: "Can't create input pipe: <reason>"; "Can't create output pipe:
 /// <reason>"; "Failed to call process '<command>': <reason>"; "Unable to write to sub-process:
-/// <reason>", also when the process has closed its standard input; "Unable to read from
-/// sub-process: <reason>"; "Error waiting for process '<command>': <reason>". After a failed write
-/// or read the child is not waited for: it may run on, and is left to the host to collect.
+/// <reason>", as when the process closes its standard input or ends before it has read an `input`
+/// that is larger than a pipe holds (a smaller one is written before the process starts, which need
+/// not read it); "Unable to read from sub-process: <reason>"; "Error waiting for process
+/// '<command>': <reason>". After a failed write or read the pipes are closed first, and the process
+/// is then waited for, too; the listener does not hear of it.
 ZELMAR_EXPORT int AutoCli_ShellCmd(const std::string& command, std::string& output,
                                    const std::string& input);
 

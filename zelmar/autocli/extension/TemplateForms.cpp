@@ -1,6 +1,8 @@
 #include <zelmar/autocli/extension/TemplateForms.h>
 
 #include <algorithm>
+#include <optional>
+#include <utility>
 
 namespace AutoCli {
 
@@ -96,82 +98,19 @@ std::optional<Form> FindRepeatedList(std::string_view text, std::string_view hea
     return begin == npos ? std::nullopt : ReadRepeatedList(text, begin, begin + head.size());
 }
 
-// Replaces what `find` finds by what `replacement` makes of it.
-template <class Find, class Replacement>
-void ReplaceForms(std::string& text, Find find, const std::string& head, Replacement replacement) {
-    auto form = find(text, head, 0);
-    if (!form) {
-        return;
-    }
-    std::string replaced;
-    size_t done = 0;
-    for (; form; form = find(text, head, done)) {
-        replaced.append(text, done, form->begin - done).append(replacement(*form));
-        done = form->end;
-    }
-    text = replaced.append(text, done);
-}
-
-std::string ValueHead(std::string_view name) {
-    return HeadOf("$val{", name, "}");
-}
-
-std::string JoinedListHead(std::string_view name) {
-    return HeadOf("$list{", name, ",'");
-}
-
-std::string RepeatedListHead(std::string_view name) {
-    return HeadOf("$multilist{", name, ",");
-}
-
-ListArguments ArgumentsOf(const Form& form) {
-    return {std::string(form.argument), form.quote};
-}
-
-}  // namespace
-
-void ReplaceConditions(std::string& text, std::string_view name) {
-    ReplaceForms(text, FindCondition, HeadOf("$if{", name, ","),
-                 [](const Form& form) { return form.argument; });
-}
-
-void ReplaceValues(std::string& text, std::string_view name, std::string_view value) {
-    ReplaceForms(text, FindValue, ValueHead(name), [value](const Form&) { return value; });
-}
-
-void ReplaceJoinedLists(std::string& text, std::string_view name, std::string_view list) {
-    ReplaceForms(text, FindJoinedList, JoinedListHead(name), [list](const Form&) { return list; });
-}
-
-void ReplaceRepeatedLists(std::string& text, std::string_view name, std::string_view list) {
-    ReplaceForms(text, FindRepeatedList, RepeatedListHead(name),
-                 [list](const Form&) { return list; });
-}
-
-std::optional<LastValue> FindLastValue(std::string_view text, std::string_view name) {
-    const std::string form = ValueHead(name);
-    const size_t begin = text.rfind(form);
-    if (begin == npos) {
-        return std::nullopt;
-    }
-    return LastValue{text.substr(0, begin).ends_with('\'') &&
-                     text.substr(begin + form.size()).starts_with('\'')};
-}
-
-std::optional<ListArguments> FindLastJoinedList(std::string_view text, std::string_view name) {
-    const std::string head = JoinedListHead(name);
+// The last joined list. Forms of this kind never stand inside one another.
+std::optional<Form> FindLastJoinedList(std::string_view text, std::string_view head) {
     for (size_t begin = text.rfind(head); begin != npos;
          begin = begin == 0 ? npos : text.rfind(head, begin - 1)) {
         if (const auto form = ReadJoinedList(text, begin, begin + head.size())) {
-            return ArgumentsOf(*form);
+            return form;
         }
     }
     return std::nullopt;
 }
 
 // The last opening that an end follows, with at least one character between them.
-std::optional<ListArguments> FindLastRepeatedList(std::string_view text, std::string_view name) {
-    const std::string head = RepeatedListHead(name);
+std::optional<Form> FindLastRepeatedList(std::string_view text, std::string_view head) {
     size_t lastEnd = 0;
     for (const ListEnd& end : listEnds) {
         const size_t place = text.rfind(end.text);
@@ -180,11 +119,60 @@ std::optional<ListArguments> FindLastRepeatedList(std::string_view text, std::st
     if (lastEnd <= head.size()) {
         return std::nullopt;
     }
-    const size_t begin = text.rfind(head, lastEnd - 1 - head.size());
-    if (begin == npos) {
-        return std::nullopt;
+    return FindRepeatedList(text, head, text.rfind(head, lastEnd - 1 - head.size()));
+}
+
+// Replaces what `find` finds by what `replacement` makes of it.
+template <class Find, class Replacement>
+void ReplaceForms(std::string& text, Find find, const std::string& head, Replacement replacement) {
+    std::string replaced;
+    size_t done = 0;
+    for (auto form = find(text, head, 0); form; form = find(text, head, done)) {
+        replaced.append(text, done, form->begin - done).append(replacement(*form));
+        done = form->end;
     }
-    return ArgumentsOf(*ReadRepeatedList(text, begin, begin + head.size()));
+    if (done > 0) {
+        text = std::move(replaced.append(text, done));
+    }
+}
+
+template <class Find, class FindLast>
+void ReplaceLists(std::string& text, Find find, FindLast findLast, const std::string& head,
+                  const ListMaker& list) {
+    if (const auto last = findLast(text, head)) {
+        const std::string replacement = list(last->argument, last->quote);
+        ReplaceForms(
+            text, find, head, [&](const Form&) -> auto& { return replacement; });
+    }
+}
+
+}  // namespace
+
+void ReplaceValues(std::string& text, std::string_view name, const ValueMaker& value) {
+    const std::string form = HeadOf("$val{", name, "}");
+    const size_t last = text.rfind(form);
+    if (last == npos) {
+        return;
+    }
+    const std::string_view whole = text;
+    const std::string replacement = value(whole.substr(0, last).ends_with('\'') &&
+                                          whole.substr(last + form.size()).starts_with('\''));
+    ReplaceForms(
+        text, FindValue, form, [&](const Form&) -> auto& { return replacement; });
+}
+
+void ReplaceConditions(std::string& text, std::string_view name) {
+    ReplaceForms(text, FindCondition, HeadOf("$if{", name, ","),
+                 [](const Form& form) { return form.argument; });
+}
+
+void ReplaceJoinedLists(std::string& text, std::string_view name, const ListMaker& list) {
+    ReplaceLists(text, FindJoinedList, FindLastJoinedList, HeadOf("$list{", name, ",'"), list);
+}
+
+void ReplaceRepeatedLists(std::string& text, std::string_view name, const ListMaker& list) {
+    ReplaceLists(text, FindRepeatedList, FindLastRepeatedList, HeadOf("$multilist{", name, ","),
+                 list);
 }
 
 }  // namespace AutoCli

@@ -1,6 +1,6 @@
 #pragma once
 
-#include <optional>
+#include <functional>
 #include <string>
 #include <string_view>
 
@@ -17,26 +17,17 @@
 
 namespace AutoCli {
 
+/// The value of all value forms; given is whether a single quote stands on either side of the last.
+using ValueMaker = std::function<std::string(bool isQuoted)>;
+void ReplaceValues(std::string& text, std::string_view name, const ValueMaker& value);
+
 /// Each condition becomes its body.
 void ReplaceConditions(std::string& text, std::string_view name);
-void ReplaceValues(std::string& text, std::string_view name, std::string_view value);
-void ReplaceJoinedLists(std::string& text, std::string_view name, std::string_view list);
-void ReplaceRepeatedLists(std::string& text, std::string_view name, std::string_view list);
 
-/// The last value form, which decides for all of them.
-struct LastValue {
-    bool isQuoted;  ///< a single quote stands on either side
-};
-[[nodiscard]] std::optional<LastValue> FindLastValue(std::string_view text, std::string_view name);
-
-/// The arguments of the last list form, which hold for all of them.
-struct ListArguments {
-    std::string text;  ///< the separator or the prefix
-    bool quote;
-};
-[[nodiscard]] std::optional<ListArguments> FindLastJoinedList(std::string_view text,
-                                                              std::string_view name);
-[[nodiscard]] std::optional<ListArguments> FindLastRepeatedList(std::string_view text,
-                                                                std::string_view name);
+/// What all list forms of a kind become; given are the arguments of the last: the separator or the
+/// prefix, and the quote word.
+using ListMaker = std::function<std::string(std::string_view argument, bool quote)>;
+void ReplaceJoinedLists(std::string& text, std::string_view name, const ListMaker& list);
+void ReplaceRepeatedLists(std::string& text, std::string_view name, const ListMaker& list);
 
 }  // namespace AutoCli

@@ -50,8 +50,7 @@ ssize_t WriteWithoutSignal(int descriptor, const char* bytes, size_t count) {
     const int error = errno;
     if (written < 0 && error == EPIPE && !wasPending) {
         const timespec atOnce = {};
-        while (sigtimedwait(&brokenPipe, nullptr, &atOnce) < 0 && errno == EINTR) {
-        }
+        sigtimedwait(&brokenPipe, nullptr, &atOnce);
     }
     pthread_sigmask(SIG_SETMASK, &before, nullptr);
     errno = error;

@@ -80,7 +80,10 @@ dialect() {
         _operand_count=$((_operand_count + 1))
         _name=${_operand%%=*}
         case $_name in
-        "$_operand" | '' | [0-9]* | *[!A-Za-z0-9_]*) ;;
+        "$_operand" | '' | [0-9]* | *[!A-Za-z0-9_]*)
+            [ "$_operand" = - ] || { [ -r "$_operand" ] && [ ! -d "$_operand" ]; } ||
+                fail "Unable to read $_operand"
+            ;;
         *)
             _argument="ARGV[$_operand_count]"
             _variables="$_variables $_name = substr($_argument, $((${#_name} + 2))); $_argument = \"\";"

@@ -5,8 +5,7 @@
 #include <gtest/gtest.h>
 #include <boost/regex.hpp>
 
-#include <iostream>
-#include <sstream>
+#include <algorithm>
 
 using CallSpec::InputSpec;
 using CallSpec::ParameterSpec;
@@ -54,28 +53,6 @@ std::string Taken(OptionParser& parser, const std::shared_ptr<InputSpec>& spec) 
     }
     return text;
 }
-
-// Stands in for the terminal: what is read from standard input and what is shown on the output.
-class Terminal {
-public:
-    explicit Terminal(const std::string& typed)
-        : _typed(typed), _in(std::cin.rdbuf(&_typed)), _out(std::cout.rdbuf(&_shown)) {}
-    ~Terminal() {
-        std::cin.rdbuf(_in);
-        std::cin.clear();
-        std::cout.rdbuf(_out);
-    }
-    Terminal(const Terminal&) = delete;
-    Terminal& operator=(const Terminal&) = delete;
-
-    std::string Shown() const { return _shown.str(); }
-
-private:
-    std::stringbuf _typed;
-    std::stringbuf _shown;
-    std::streambuf* const _in;
-    std::streambuf* const _out;
-};
 
 TEST(OptionParser, TellsOptionsAsTheirExpressionsDo) {
     const boost::regex any("^(-[a-zA-Z]|--([a-zA-Z][a-zA-Z0-9-]+)(=.+)?)$");
@@ -154,25 +131,6 @@ TEST(OptionParser, SplitsALineIntoWords) {
         EXPECT_EQ(Words(parser.GetNamespaces().begin(), parser.GetNamespaces().end()), words)
             << line;
         EXPECT_EQ(parser.GetDispatcher(), "tool");
-    }
-}
-
-TEST(OptionParser, AsksForASecretThatHasNoValue) {
-    const struct {
-        std::string line, typed, pieces, shown;
-    } cases[] = {
-        {"a -p -f", "hush\nrest", " a (p=hush)(f=)", "Enter value for 'password': \n"},
-        {"a --password", " h ", " a (password= h )", "Enter value for 'password': \n"},
-        {"a --password", "", " a (password=)", "Enter value for 'password': \n"},
-        {"a --password=x -p y", "hush\n", " a (password=x)(p=y)", ""},
-        {"-p", "hush\n", "(p=) ", ""},
-    };
-    for (const auto& [line, typed, pieces, shown] : cases) {
-        const Terminal terminal(typed);
-        OptionParser parser;
-        parser.ParseString(line);
-        EXPECT_EQ(Taken(parser, Declaration()).substr(0, pieces.size()), pieces);
-        EXPECT_EQ(terminal.Shown(), shown);
     }
 }
 

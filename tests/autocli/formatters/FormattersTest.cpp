@@ -90,13 +90,13 @@ TEST(Formatters, EveryLineEndIsAFlush) {
     for (const auto& formatter : Formatters()) {
         Counter counter;
         std::ostream stream(&counter);
-        Write(*formatter, SampleValues()["structs"], stream);
+        Write(*formatter, SampleValues()["struct"], stream);
         EXPECT_EQ(counter.flushes, std::ranges::count(counter.str(), '\n')) << formatter->GetName();
 
         counter.flushes = 0;
         {
             const BlockOutput blocks(stream);
-            Write(*formatter, SampleValues()["structs"], stream);
+            Write(*formatter, SampleValues()["struct"], stream);
         }
         EXPECT_EQ(counter.flushes, 1) << formatter->GetName();
     }

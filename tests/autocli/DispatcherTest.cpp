@@ -19,7 +19,6 @@ namespace {
 
 using Texts = std::vector<std::string>;
 using OutputPointer = std::shared_ptr<Output>;
-using Formatters = std::vector<std::shared_ptr<Formatter>>;
 
 const std::string implementationError =
     "Implementation error! The output of this command does not match the declared output type, see"
@@ -155,31 +154,30 @@ TEST_F(DispatcherTest, ListsTheCommandsThatPassAllFilters) {
     }
 }
 
-TEST_F(DispatcherTest, PrintsThroughTheNamedFormatterOnly) {
-    output = CommandOutput::New();
-    FormatParameters parameters;
-    DisplayContext context;
-    std::ostringstream stream;
-    EXPECT_TRUE(dispatcher.FormatOutput(output, parameters, context, stream));
-    parameters.SetFormatter("clihelp");
-    EXPECT_FALSE(dispatcher.FormatOutput(output, parameters, context, stream));
-    EXPECT_EQ(output->GetErrors(), Texts({"Unable to find requested formatter: clihelp"}));
-    EXPECT_EQ(stream.str(), "");
-}
+// Writes a word and answers false.
+class WordFormatter : public Formatter {
+public:
+    using Formatter::Formatter;
+    bool Format(const OutputPointer& /*output*/, FormatParameters& /*parameters*/,
+                DisplayContext& /*context*/, std::ostream& stream) override {
+        stream << "word" << std::endl;
+        return false;
+    }
+};
 
-// A plugin that brings formatters and, when told so, a node under a name that is taken.
+// A plugin that brings formatters and a node under a name that may be taken.
 class TestPlugin : public Plugin {
 public:
-    TestPlugin(std::string name, Formatters formatters, bool collides = false)
-        : _name(std::move(name)), _formatters(std::move(formatters)), _collides(collides) {}
+    TestPlugin(std::string node, const Texts& formatters) : _node(std::move(node)) {
+        for (const std::string& name : formatters) {
+            _formatters.push_back(std::make_shared<WordFormatter>(name));
+        }
+    }
 
     void Initialize() override {}
     const std::string& GetName() const override { return _name; }
     void RegisterNamespaces(std::shared_ptr<Namespace> root) override {
-        root->SubNamespace("from" + _name);
-        if (_collides) {
-            root->RegisterNamespaceNode(Namespace::New(), "kelvash");
-        }
+        root->RegisterNamespaceNode(Namespace::New(), _node);
     }
     bool HasFormatter(const std::string& name) override { return GetFormatter(name) != nullptr; }
     std::shared_ptr<Formatter> GetFormatter(const std::string& name) override {
@@ -187,67 +185,54 @@ public:
             _formatters, name, [](const auto& formatter) { return formatter->GetName(); });
         return found == _formatters.end() ? nullptr : *found;
     }
-    const Formatters& GetFormatters() override { return _formatters; }
+    const std::vector<std::shared_ptr<Formatter>>& GetFormatters() override { return _formatters; }
 
 private:
-    const std::string _name;
-    const Formatters _formatters;
-    const bool _collides;
+    const std::string _name = "Test";
+    const std::string _node;
+    std::vector<std::shared_ptr<Formatter>> _formatters;
 };
 
-// Writes a word and answers false.
-class WordFormatter : public Formatter {
-public:
-    using Formatter::Formatter;
-    bool Format(const std::shared_ptr<Output>& /*output*/, FormatParameters& /*parameters*/,
-                DisplayContext& /*context*/, std::ostream& stream) override {
-        stream << "word" << std::endl;
-        return false;
-    }
-};
-
-Texts FormatterNames(Dispatcher& dispatcher) {
+TEST_F(DispatcherTest, TakesAPluginWithItsFormattersAndNodes) {
+    dispatcher.RegisterPlugin(std::make_shared<TestPlugin>("good", Texts{"word"}));
+    EXPECT_EQ(dispatcher.GetPluginNames(), Texts({"Internal", "Test"}));
     Texts names;
     for (const auto& formatter : dispatcher.GetFormatters()) {
         names.push_back(formatter->GetName());
     }
-    return names;
-}
-
-TEST_F(DispatcherTest, TakesAPluginWithItsFormattersAndNodes) {
-    const auto words = std::make_shared<WordFormatter>("word");
-    dispatcher.RegisterPlugin(std::make_shared<TestPlugin>("Good", Formatters{words}));
-    EXPECT_EQ(dispatcher.GetPluginNames(), Texts({"Internal", "Good"}));
-    EXPECT_EQ(FormatterNames(dispatcher),
-              Texts({"commandhelp", "json", "python", "simple", "table", "word", "xml"}));
+    EXPECT_EQ(names, Texts({"commandhelp", "json", "python", "simple", "table", "word", "xml"}));
     dispatcher.ResetRegistrations();
     EXPECT_EQ(dispatcher.GetPluginNames(), Texts());
-    EXPECT_EQ(dispatcher.GetFormatter("word"), words);
+    EXPECT_EQ(dispatcher.GetRootNamespace()->GetNamespaceNodeNames(), Texts({"good", "kelvash"}));
     EXPECT_FALSE(dispatcher.HasFormatter("Word"));
-    FormatParameters parameters;
-    parameters.SetFormatter("word");
-    DisplayContext context;
+    output = CommandOutput::New();
     std::ostringstream stream;
-    EXPECT_TRUE(dispatcher.FormatOutput(Output::New(), parameters, context, stream));
+    DisplayContext context;
+    const auto print = [&](const char* formatter) {
+        FormatParameters parameters;
+        parameters.SetFormatter(formatter);
+        return dispatcher.FormatOutput(output, parameters, context, stream);
+    };
+    EXPECT_TRUE(print(""));
+    EXPECT_TRUE(print("word"));  // whatever the formatter answers
+    EXPECT_FALSE(print("clihelp"));
     EXPECT_EQ(stream.str(), "word\n");
-    EXPECT_EQ(dispatcher.GetRootNamespace()->GetNamespaceNodeNames(),
-              Texts({"fromGood", "kelvash"}));
+    EXPECT_EQ(output->GetErrors(), Texts({"Unable to find requested formatter: clihelp"}));
 }
 
 TEST_F(DispatcherTest, RefusesAPluginWhoseNamesAreTaken) {
-    const auto refusal = [this](const std::shared_ptr<Plugin>& plugin) {
+    const auto refusal = [this](const char* node, const Texts& formatters) {
+        const auto plugin = std::make_shared<TestPlugin>(node, formatters);
         return Thrown([&] { dispatcher.RegisterPlugin(plugin); });
     };
     const auto builtIn = dispatcher.GetFormatter("table");
-    EXPECT_EQ(refusal(std::make_shared<TestPlugin>("Node", Formatters(), true)),
-              "Error while trying to register the plugin Node Duplicate registration in namespace "
-              " attempt to register two objects with name kelvash The functionality in Node will"
+    EXPECT_EQ(refusal("kelvash", {}),
+              "Error while trying to register the plugin Test Duplicate registration in namespace "
+              " attempt to register two objects with name kelvash The functionality in Test will"
               " not be available until this issue is resolved.");
-    EXPECT_EQ(refusal(std::make_shared<TestPlugin>(
-                  "Form", Formatters{std::make_shared<WordFormatter>("word"),
-                                     std::make_shared<WordFormatter>("table")})),
-              "Error while trying to register the plugin Form  this plugin has a formatter table"
-              " that was already registered from the plugin Internal  The functionality in Form"
+    EXPECT_EQ(refusal("form", {"word", "table"}),
+              "Error while trying to register the plugin Test  this plugin has a formatter table"
+              " that was already registered from the plugin Internal  The functionality in Test"
               " will not be available until this issue is resolved.");
     EXPECT_EQ(dispatcher.GetPluginNames(), Texts({"Internal"}));
     EXPECT_EQ(dispatcher.GetFormatter("table"), builtIn);

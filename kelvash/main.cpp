@@ -1,9 +1,8 @@
+#include "StandardStreams.h"
+
 #include <zelmar/zelmar.h>
 
-#include <poll.h>
-#include <unistd.h>
-
-#include <cstdio>
+#include <csignal>
 #include <cstdlib>
 #include <filesystem>
 #include <iostream>
@@ -18,27 +17,13 @@ int ReportAndFail(const char* message) {
     return EXIT_FAILURE;
 }
 
-bool ReaderIsGone(int descriptor) {
-    pollfd output = {descriptor, POLLOUT, 0};
-    return poll(&output, 1, 0) == 1 && (output.revents & POLLERR) != 0;
-}
-
-// Runs at exit, where the last of the output leaves: what could not be written must not pass for a
-// success. That a reader has seen enough is no news to anybody.
-void CheckStandardOutput() {
-    if (std::cout.flush().good() && std::fflush(stdout) == 0) {
-        return;
-    }
-    if (!ReaderIsGone(STDOUT_FILENO)) {
-        ReportAndFail("Unable to write to standard output");
-    }
-    _exit(EXIT_FAILURE);
-}
-
 }  // namespace
 
 int main(int argc, char** argv) {
-    std::atexit(&CheckStandardOutput);
+    FillClosedStreams();
+    CheckStandardOutputAtExit();
+    // A caller that ignores the end of its children passes that on; a command waits for its own.
+    std::signal(SIGCHLD, SIG_DFL);
     // Outlives the handlers: the code of what they catch may lie in a plugin that goes with it.
     std::optional<AutoCli::CliDispatcher> dispatcher;
     try {

@@ -3,9 +3,11 @@
 #include <zelmar/internal/Ascii.h>
 #include <zelmar/internal/platform/SilentTerminal.h>
 
+#include <unistd.h>
+
 #include <algorithm>
+#include <cstdio>
 #include <iostream>
-#include <optional>
 #include <string_view>
 
 using CallSpec::ParameterSpec;
@@ -84,10 +86,47 @@ std::string Dump(const std::vector<OptionParser::Option>& options) {
     return text;
 }
 
+bool IsBlank(char c) {
+    return c == ' ' || c == '\t';
+}
+
 std::string WithoutQuotes(std::string_view text) {
     std::string word(text);
     std::erase(word, '"');
     return word;
+}
+
+// Blanks ahead of the first word are passed over by their number, wherever quotes stand among them:
+// each of these quotes lets one more of the blanks behind it into the word.
+std::vector<std::string> SplitLine(std::string_view line) {
+    const size_t first = std::min(line.find_first_not_of(" \t\""), line.size());
+    if (line.substr(first).starts_with('#')) {
+        return {};
+    }
+    const std::string_view lead = line.substr(0, first);
+    auto start = static_cast<size_t>(std::ranges::count_if(lead, IsBlank));
+    bool inQuote = (lead.size() - start) % 2 == 1;
+    std::vector<std::string> words;
+    for (size_t i = first; i < line.size(); ++i) {
+        if (line[i] == '"') {
+            inQuote = !inQuote;
+        } else if (IsBlank(line[i]) && !inQuote) {
+            words.push_back(WithoutQuotes(line.substr(start, i - start)));
+            start = std::min(line.find_first_not_of(" \t", i), line.size());
+            i = start - 1;
+        }
+    }
+    if (std::string last = WithoutQuotes(line.substr(start)); !last.empty()) {
+        words.push_back(std::move(last));
+    }
+    return words;
+}
+
+// Where the result leaves another way, a prompt goes to the terminal that is typed on.
+void Prompt(const std::string& text) {
+    if (!WriteBesideOutput(text)) {
+        std::cout << text << std::flush;
+    }
 }
 
 }  // namespace
@@ -145,20 +184,28 @@ std::string OptionParser::ValueOfBareOption(const std::string& token, const std:
         return "";  // an unknown name is for the validation to report
     }
     if (parameter->IsSecret()) {
-        return PromptForSecret(parameter->GetName());
+        if (auto secret = PromptForSecret(parameter->GetName())) {
+            return std::move(*secret);
+        }
+    } else if (parameter->GetParameterType() == CallSpec::ParameterTypeFlag ||
+               parameter->GetName() == "help") {
+        return "";
     }
-    if (parameter->GetParameterType() != CallSpec::ParameterTypeFlag &&
-        parameter->GetName() != "help") {
-        _errors.push_back(token + " must have value");
-    }
+    _errors.push_back(token + " must have value");
     return "";
 }
 
-std::string OptionParser::PromptForSecret(const std::string& fullName) {
-    std::cout << "Enter value for '" << fullName << "': " << std::flush;
+std::optional<std::string> OptionParser::PromptForSecret(const std::string& fullName) {
+    Prompt("Enter value for '" + fullName + "': ");
     std::string value = GetSilentString();
-    std::cout << std::endl;
-    return value;
+    Prompt("\n");
+    if (std::cin || isatty(STDIN_FILENO) == 0) {
+        return value;
+    }
+    // Ctrl-D ends one prompt and not the terminal.
+    std::clearerr(stdin);
+    std::cin.clear();
+    return std::nullopt;
 }
 
 std::list<std::string> OptionParser::ParsePath(std::stack<std::string>& words) {
@@ -186,37 +233,8 @@ bool OptionParser::IsParameter(const std::string& token) {
     return ReadOption(token).has_value();
 }
 
-// `start` is not where the first word begins but the count of blanks outside of it: a quote in
-// front of blanks does not stop them from counting, so of those only one reaches the word.
 bool OptionParser::ParseString(const std::string& line) {
-    const auto isBlank = [](char c) { return c == ' ' || c == '\t'; };
-    std::vector<std::string> words;
-    size_t start = 0;
-    bool inQuote = false;
-    bool inToken = false;
-    for (size_t i = 0; i < line.size(); ++i) {
-        if (line[i] == '"') {
-            inQuote = !inQuote;
-        } else if (!isBlank(line[i])) {
-            if (line[i] == '#' && !inToken) {
-                break;
-            }
-            inToken = true;
-        } else if (!inToken) {
-            ++start;
-        } else if (!inQuote) {
-            words.push_back(WithoutQuotes(std::string_view(line).substr(start, i - start)));
-            i = std::min(line.find_first_not_of(" \t", i), line.size());
-            start = i;
-            --i;
-        }
-        if (i + 1 == line.size()) {
-            std::string last = WithoutQuotes(std::string_view(line).substr(start));
-            if (!last.empty()) {
-                words.push_back(std::move(last));
-            }
-        }
-    }
+    std::vector<std::string> words = SplitLine(line);
     if (words.empty()) {
         return true;
     }

@@ -4,6 +4,7 @@
 
 #include <list>
 #include <memory>
+#include <optional>
 #include <stack>
 #include <string>
 #include <utility>
@@ -53,13 +54,18 @@ public:
     static bool IsParameter(const std::string& token);
 
     /// Parses the options of the command, once. An option that needs a value and has none is a
-    /// complaint; for a secret, the value is asked for on standard output and read from standard
-    /// input. Without a specification, neither happens.
+    /// complaint, "<option> must have value"; for a secret, the value is asked for on standard
+    /// output and read from standard input. Where standard output is no terminal and standard input
+    /// is the controlling one, the question is asked there. Ctrl-D at a terminal is no value; from
+    /// elsewhere the end of input is an empty one. Without a specification, nothing of this
+    /// happens.
     void ProcessCommandArguments();
     /// Counts only ahead of the parsing of the command's options.
     void SetInputSpec(std::shared_ptr<CallSpec::InputSpec> spec) { _inputSpec = std::move(spec); }
 
-    /// Reads one line from standard input, with the terminal's echo off if it is a terminal.
+    /// Reads one line from standard input, with the terminal's echo off if it is a terminal. A
+    /// signal that ends or stops the process meanwhile, or that the host handles, finds the echo
+    /// on.
     std::string GetSilentString();
 
     /// A dump for diagnosis.
@@ -85,7 +91,7 @@ public:
 
 private:
     std::string ValueOfBareOption(const std::string& token, const std::string& name);
-    std::string PromptForSecret(const std::string& fullName);
+    std::optional<std::string> PromptForSecret(const std::string& fullName);
 
     bool _parsed = false;
     std::vector<std::string> _errors;

@@ -137,6 +137,8 @@ TEST(OptionParser, SplitsALineIntoWords) {
 TEST(OptionParser, WithoutADeclarationNothingNeedsAValue) {
     OptionParser parser;
     const char* const argv[] = {"./bin/tool", "-q", "a", "b", "--level", "-p"};
+    parser.ParseArgv(0, nullptr);
+    EXPECT_EQ(parser.GetDispatcher(), "kelvash");
     parser.ParseArgv(6, argv);
     EXPECT_FALSE(parser.HasCommandParameter("nosuch"));
     EXPECT_EQ(Taken(parser, Declaration()), "(q=a) b (level=)(p=)");

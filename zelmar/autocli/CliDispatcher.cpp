@@ -5,16 +5,21 @@
 #include <zelmar/autocli/formatters/CliDispatcherHelpFormatter.h>
 #include <zelmar/internal/Ascii.h>
 
+#include <fcntl.h>
 #include <sys/ioctl.h>
 #include <unistd.h>
 
+#include <ext/stdio_filebuf.h>
+
 #include <algorithm>
 #include <array>
+#include <cerrno>
+#include <cstdio>
 #include <cstdlib>
 #include <filesystem>
-#include <fstream>
 #include <iostream>
 #include <string_view>
+#include <system_error>
 
 using CallSpec::Output;
 using MetaObj::MetaList;
@@ -30,9 +35,6 @@ constexpr std::array<std::string_view, 7> dispatcherOptions = {
     "h", "help", "formatter", "plugin-dir", "plugin", "format-param", "screen-width"};
 
 constexpr int widestScreen = 9999;
-
-// 0 until `--screen-width` is heeded; then it holds for the later lines of a stream too.
-int screenWidthOverride = 0;
 
 bool IsKeyCharacter(char c) {
     return Ascii::IsAlnum(c) || std::string_view(" .-:").find(c) != std::string_view::npos;
@@ -62,6 +64,17 @@ void ChooseFormatter(const OptionParser& parser, FormatParameters& overrides, Ou
     } else if (names.size() == 1) {
         overrides.SetFormatter(names.front());
     }
+}
+
+void TakeParseErrors(const OptionParser& parser, Output& output) {
+    for (const std::string& error : parser.GetParseErrors()) {
+        output.AddErrorMessage(error);
+    }
+}
+
+// std::cin, which reads by way of stdin, takes a failure for the end.
+bool HasFailed(const std::istream& stream) {
+    return stream.bad() || (&stream == &std::cin && std::ferror(stdin) != 0);
 }
 
 const char* WordFor(NamespaceNodeType type) {
@@ -114,7 +127,9 @@ void CliDispatcher::HandleArgvInput(int argc, const char* const* argv) {
 
 bool CliDispatcher::HandleOptions(OptionParser& parser, bool allowInput) {
     const auto output = CommandOutput::New();
-    if (ReportParseErrors(parser, output)) {
+    TakeParseErrors(parser, *output);
+    if (output->HasError()) {
+        PrintError(output);
         return false;
     }
     _dispatcherName = parser.GetDispatcher();
@@ -122,28 +137,21 @@ bool CliDispatcher::HandleOptions(OptionParser& parser, bool allowInput) {
     if (!HandleDispatcherOptions(parser, overrides, output)) {
         std::exit(EXIT_FAILURE);
     }
+    DisplayContext context;
+    GetDisplayContext(context);
     if (allowInput && parser.HasDispatcherParameter("input")) {
         return HandleInput(parser);
     }
     std::list<std::string> path = parser.GetCommandPath();
     const auto node = GetRootNamespace()->ResolveNode(path);
-    bool result = false;
-    if (const auto command = std::dynamic_pointer_cast<Command>(node)) {
-        result = HandleCommand(parser, *command, overrides, output);
+    const auto command = std::dynamic_pointer_cast<Command>(node);
+    if (command) {
+        HandleCommand(parser, *command, overrides, context, output);
     } else {
         PrintChildren(node ? node : GetRootNamespace(), output);
     }
     PrintError(output);
-    return result && !output->HasError();
-}
-
-bool CliDispatcher::ReportParseErrors(const OptionParser& parser,
-                                      const std::shared_ptr<CommandOutput>& output) {
-    for (const std::string& error : parser.GetParseErrors()) {
-        output->AddErrorMessage(error);
-    }
-    PrintError(output);
-    return output->HasError();
+    return command && !output->HasError();
 }
 
 // What the line says beside `--input`, complaints about it included, does not reach the stream.
@@ -157,48 +165,68 @@ bool CliDispatcher::HandleInput(const OptionParser& parser) {
     if (name == "STDIN") {
         return ParseStreamInput(std::cin);
     }
-    std::ifstream file(name);
+    // Not a std::ifstream, whose descriptor every child of a command would inherit.
+    __gnu_cxx::stdio_filebuf<char> file(open(name.c_str(), O_RDONLY | O_CLOEXEC), std::ios::in);
     std::error_code noError;
-    if (!file || std::filesystem::is_directory(name, noError)) {
+    if (!file.is_open() || std::filesystem::is_directory(name, noError)) {
         std::cerr << "Unable to open file " << name << std::endl;
         return false;
     }
-    return ParseStreamInput(file);
+    std::istream stream(&file);
+    return ParseStreamInput(stream);
 }
 
 bool CliDispatcher::ParseStreamInput(std::istream& stream) {
     bool result = true;
     std::string line;
-    while (std::getline(stream, line)) {
+    errno = 0;
+    // The half of a line that a failure leaves is no command.
+    while (std::getline(stream, line) && !HasFailed(stream)) {
         OptionParser parser;
         if (!parser.ParseString(line)) {
             result = HandleOptions(parser, false);
         }
+        errno = 0;
+    }
+    if (HasFailed(stream)) {
+        std::cerr << "Unable to read the input: " << std::generic_category().message(errno)
+                  << std::endl;
+        return false;
     }
     return result;
 }
 
-bool CliDispatcher::HandleCommand(OptionParser& parser, Command& command,
-                                  const FormatParameters& overrides,
+void CliDispatcher::HandleCommand(OptionParser& parser, Command& command,
+                                  const FormatParameters& overrides, DisplayContext& context,
                                   const std::shared_ptr<CommandOutput>& output) {
     const auto input = CommandInput::New();
     input->SetDispatcher(parser.GetDispatcher());
     input->SetCommandPath(parser.GetCommandPath());
-    parser.SetInputSpec(command.GetInputSpec());
+    const auto spec = command.GetInputSpec();
+    parser.SetInputSpec(spec);
     for (const auto& [name, value] : parser.GetCommandParameters()) {
         input->AddParameter(name, value);
     }
+    TakeParseErrors(parser, *output);
     // Complaints about the dispatcher's options count here as well: the command does not run.
-    for (const std::string& error : parser.GetParseErrors()) {
-        output->AddErrorMessage(error);
+    if (output->HasError()) {
+        return;
     }
-    return !output->HasError() && ExecuteCommand(input, output) &&
-           PrintOutput(input, output, overrides);
+    const std::string& formatter = overrides.GetFormatter();
+    if (!formatter.empty() && !HasFormatter(formatter)) {
+        // Nor does it for a result that nothing can print. A faulty input is told first.
+        input->SetInputSpec(spec);
+        if (spec->Validate(input, output)) {
+            RequireFormatter(formatter, *output);
+        }
+    } else if (ExecuteCommand(input, output)) {
+        PrintOutput(input, output, overrides, context);
+    }
 }
 
-bool CliDispatcher::PrintOutput(const std::shared_ptr<CommandInput>& input,
+void CliDispatcher::PrintOutput(const std::shared_ptr<CommandInput>& input,
                                 const std::shared_ptr<CommandOutput>& output,
-                                const FormatParameters& overrides) {
+                                const FormatParameters& overrides, DisplayContext& context) {
     FormatParameters format;
     if (output->GetOutputType() == Output::OutputTypeNormal) {
         format = GetDefaultOutputFormatParameters(input, output);
@@ -206,9 +234,7 @@ bool CliDispatcher::PrintOutput(const std::shared_ptr<CommandInput>& input,
         format = GetHelpFormatParams();
     }
     format.OverrideValues(overrides);
-    DisplayContext context;
-    GetDisplayContext(context);
-    return FormatOutput(output, format, context, std::cout);
+    FormatOutput(output, format, context, std::cout);
 }
 
 bool CliDispatcher::HandleDispatcherOptions(OptionParser& parser, FormatParameters& overrides,
@@ -219,7 +245,7 @@ bool CliDispatcher::HandleDispatcherOptions(OptionParser& parser, FormatParamete
         return false;
     }
     if (const auto widths = parser.GetDispatcherParameter("screen-width"); !widths.empty()) {
-        screenWidthOverride = static_cast<int>(std::strtol(widths.back().c_str(), nullptr, 0));
+        _screenWidth = static_cast<int>(std::strtol(widths.back().c_str(), nullptr, 0));
     }
     ChooseFormatter(parser, overrides, *output);
     LoadPlugins(parser);
@@ -282,8 +308,8 @@ void CliDispatcher::GetDisplayContext(DisplayContext& context) {
         context.screenWidth = terminal.ws_col;
         context.screenHeight = terminal.ws_row;
     }
-    if (screenWidthOverride >= 1 && screenWidthOverride <= widestScreen) {
-        context.screenWidth = static_cast<uint16_t>(screenWidthOverride);
+    if (_screenWidth >= 1 && _screenWidth <= widestScreen) {
+        context.screenWidth = static_cast<uint16_t>(_screenWidth);
     }
 }
 

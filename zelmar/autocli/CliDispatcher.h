@@ -28,7 +28,8 @@ public:
     /// the usage text. `allowInput` tells whether `--input` may be heeded.
     bool HandleOptions(OptionParser& parser, bool allowInput);
     /// Runs each line of a stream; the result is that of the last line that held words, and true
-    /// when there was none.
+    /// when there was none. A stream that fails ends with "Unable to read the input: <reason>" on
+    /// the error stream and false.
     bool ParseStreamInput(std::istream& stream);
 
     /// Acts on the options in front of the path. False when it printed the usage text.
@@ -38,7 +39,7 @@ public:
                                       const std::shared_ptr<CallSpec::Output>& output);
 
     /// Fills in the size of the terminal on standard output and, over its width, that of
-    /// `--screen-width`, which holds for the rest of the process.
+    /// `--screen-width`, which holds for the later lines of this dispatcher too.
     void GetDisplayContext(DisplayContext& context);
     /// The formatter "commandhelp", without parameters.
     FormatParameters GetHelpFormatParams();
@@ -50,17 +51,16 @@ public:
 
 private:
     bool HandleInput(const OptionParser& parser);
-    bool HandleCommand(OptionParser& parser, Command& command, const FormatParameters& overrides,
-                       const std::shared_ptr<CommandOutput>& output);
-    bool PrintOutput(const std::shared_ptr<CommandInput>& input,
+    void HandleCommand(OptionParser& parser, Command& command, const FormatParameters& overrides,
+                       DisplayContext& context, const std::shared_ptr<CommandOutput>& output);
+    void PrintOutput(const std::shared_ptr<CommandInput>& input,
                      const std::shared_ptr<CommandOutput>& output,
-                     const FormatParameters& overrides);
-    bool ReportParseErrors(const OptionParser& parser,
-                           const std::shared_ptr<CommandOutput>& output);
+                     const FormatParameters& overrides, DisplayContext& context);
     void PrintUsage() const;
     void LoadPlugins(const OptionParser& parser);
 
     std::string _dispatcherName;
+    int _screenWidth = 0;  // what `--screen-width` said last; out of bounds it has no effect
 };
 
 }  // namespace AutoCli

@@ -73,14 +73,20 @@ bool Dispatcher::FormatOutput(const std::shared_ptr<CallSpec::Output>& output,
     if (name.empty()) {
         return true;
     }
-    const auto formatter = GetFormatter(name);
-    if (!formatter) {
-        output->AddErrorMessage("Unable to find requested formatter: " + name);
+    if (!RequireFormatter(name, *output)) {
         return false;
     }
     const BlockOutput blocks(stream);
-    formatter->Format(output, parameters, context, stream);
+    GetFormatter(name)->Format(output, parameters, context, stream);
     return true;
+}
+
+bool Dispatcher::RequireFormatter(const std::string& name, CallSpec::Output& output) {
+    const bool found = GetFormatter(name) != nullptr;
+    if (!found) {
+        output.AddErrorMessage("Unable to find requested formatter: " + name);
+    }
+    return found;
 }
 
 Plugin* Dispatcher::PluginWithFormatter(const std::string& name) {

@@ -17,7 +17,8 @@ namespace AutoCli {
 
 /// The engine: owns the tree of commands and the plugins that fill it, runs one call at a time and
 /// hands its output to a formatter. It knows nothing of command lines; `CliDispatcher` adds those.
-/// Used from one thread at a time.
+/// Used from one thread at a time, with its tree and the objects of its calls; several dispatchers
+/// can be used from a thread each, and finished values be read from any.
 ///
 /// A new dispatcher has the built-in plugin and is ready to run. A call without a command line:
 ///
@@ -64,11 +65,13 @@ public:
     /// nodes or brings a formatter whose name is taken; nodes that it has registered by then stay.
     void RegisterPlugin(std::shared_ptr<Plugin> plugin);
     /// Loads one file, by its ending: `.so` or `.xml`. Any other file is ignored. Throws what
-    /// loading throws.
+    /// loading throws; for a pipe, a socket or a device `ZelmarException`: "Unable to load plugin
+    /// from <path> : not a regular file".
     void AddPlugin(const std::string& path);
     /// Loads all plugin files of a directory in the order of their names, those of its `lib64`
     /// first. A file that fails is reported on the error stream and skipped, and so is a directory
-    /// that cannot be read, unless it is the `lib64`.
+    /// that cannot be opened, unless it is the `lib64`. Where reading a directory fails half way,
+    /// that is reported and what was found is loaded.
     void AddExternalDirectory(const std::string& directory);
     void AddExternalDirectoryInt(const std::string& directory, bool complain);
     /// Loads /usr/lib/norvane/kelvash and /usr/lib/norvane/kelvash/ext.
@@ -78,8 +81,11 @@ public:
     /// Forgets the plugins. Their formatters and their commands stay, and stay usable.
     void ResetRegistrations();
 
+protected:
+    /// False, with the message that `FormatOutput` leaves, when there is no formatter of that name.
+    bool RequireFormatter(const std::string& name, CallSpec::Output& output);
+
 private:
-    void RequireFormatterNamesFree(Plugin& plugin);
     Plugin* PluginWithFormatter(const std::string& name);
 
     std::map<std::string, std::shared_ptr<Plugin>> _formatterPlugins;

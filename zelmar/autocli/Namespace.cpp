@@ -5,9 +5,7 @@ using Zelmar::ZelmarException;
 
 namespace AutoCli {
 
-Namespace::~Namespace() {
-    DropChildren();
-}
+Namespace::~Namespace() = default;
 
 std::shared_ptr<Namespace> Namespace::New() {
     return std::make_shared<Namespace>();
@@ -37,6 +35,10 @@ void Namespace::SetParent(std::shared_ptr<NamespaceNode> parent) {
 
 std::shared_ptr<NamespaceNode> Namespace::GetParent() {
     return _parent.lock();
+}
+
+RootNamespace::~RootNamespace() {
+    DropChildren();
 }
 
 std::shared_ptr<RootNamespace> RootNamespace::New(Dispatcher* dispatcher) {

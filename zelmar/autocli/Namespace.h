@@ -12,7 +12,6 @@ namespace AutoCli {
 class ZELMAR_EXPORT Namespace : public NamespaceNode {
 public:
     Namespace() = default;
-    /// The children go first, then what `KeepAlive` was given.
     ~Namespace() override;
 
     static std::shared_ptr<Namespace> New();
@@ -26,19 +25,16 @@ public:
     void SetParent(std::shared_ptr<NamespaceNode> parent) override;
     std::shared_ptr<NamespaceNode> GetParent() override;
 
-    /// Shares in what the nodes below need for as long as they live, such as a loaded shared object
-    /// that holds their code.
-    void KeepAlive(std::shared_ptr<void> resource) { _keptAlive.push_back(std::move(resource)); }
-
 private:
     std::weak_ptr<NamespaceNode> _parent;
-    std::vector<std::shared_ptr<void>> _keptAlive;
 };
 
 /// The root of a dispatcher's tree. It has no name and shows in no path.
 class ZELMAR_EXPORT RootNamespace : public Namespace {
 public:
     explicit RootNamespace(Dispatcher* dispatcher) : _dispatcher(dispatcher) {}
+    /// The children go first, then what `KeepAlive` was given.
+    ~RootNamespace() override;
 
     /// The dispatcher owns the root and not the other way round.
     static std::shared_ptr<RootNamespace> New(Dispatcher* dispatcher);
@@ -52,8 +48,13 @@ public:
     void SetParent(std::shared_ptr<NamespaceNode> parent) override;
     std::shared_ptr<NamespaceNode> GetParent() override;
 
+    /// Shares in what the nodes of the tree need for as long as they live, such as a loaded shared
+    /// object that holds their code.
+    void KeepAlive(std::shared_ptr<void> resource) { _keptAlive.push_back(std::move(resource)); }
+
 private:
     Dispatcher* const _dispatcher;
+    std::vector<std::shared_ptr<void>> _keptAlive;
 };
 
 }  // namespace AutoCli

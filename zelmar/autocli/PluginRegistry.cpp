@@ -6,21 +6,19 @@
 #include <zelmar/autocli/extension/XmlPlugin.h>
 
 #include <dirent.h>
+#include <sys/stat.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <iostream>
 #include <string_view>
+#include <system_error>
 
 using Zelmar::ZelmarException;
 
 namespace AutoCli {
 
 namespace {
-
-std::string UnavailableUntilResolved(const Plugin& plugin) {
-    return " The functionality in " + plugin.GetName() +
-           " will not be available until this issue is resolved.";
-}
 
 bool HasEnding(std::string_view path, std::string_view ending) {
     return path.size() > ending.size() && path.ends_with(ending);
@@ -41,66 +39,81 @@ struct CloseDirectory {
     void operator()(DIR* directory) const { closedir(directory); }
 };
 
-// The paths of all entries but "." and "..", sorted. False when the directory cannot be read.
-bool ListDirectory(const std::string& directory, std::vector<std::string>& paths) {
-    const std::unique_ptr<DIR, CloseDirectory> entries(opendir(directory.c_str()));
-    if (!entries) {
-        return false;
+// What is opened in order to be loaded must not wait for somebody to write, nor act on a device. A
+// directory and a missing file are for the loader to tell of.
+void RequireRegularFile(const std::string& path) {
+    struct stat status = {};
+    if (stat(path.c_str(), &status) == 0 && !S_ISREG(status.st_mode) && !S_ISDIR(status.st_mode)) {
+        throw ZelmarException("Unable to load plugin from " + path + " : not a regular file");
     }
-    while (const dirent* entry = readdir(entries.get())) {
+}
+
+// Finds the paths of all entries but "." and "..", sorted. Where reading fails half way, the result
+// is the error; otherwise it is 0.
+int ListDirectory(DIR& directory, const std::string& path, std::vector<std::string>& paths) {
+    errno = 0;
+    while (const dirent* entry = readdir(&directory)) {
         const std::string_view name = entry->d_name;
         if (name != "." && name != "..") {
-            paths.push_back(directory + "/" + entry->d_name);
+            paths.push_back(path + "/" + entry->d_name);
         }
+        errno = 0;
     }
+    const int error = errno;
     std::ranges::sort(paths);
-    return true;
+    return error;
 }
 
 }  // namespace
 
 void Dispatcher::RegisterPlugin(std::shared_ptr<Plugin> plugin) {
+    const std::string& name = plugin->GetName();
     try {
         plugin->RegisterNamespaces(_rootNamespace);
     } catch (const ZelmarException& error) {
-        throw ZelmarException("Error while trying to register the plugin " + plugin->GetName() +
-                              " " + error.what() + UnavailableUntilResolved(*plugin));
+        throw ZelmarException("Error while trying to register the plugin " + name + " " +
+                              error.what() + " The functionality in " + name +
+                              " will not be available until this issue is resolved.");
     }
-    RequireFormatterNamesFree(*plugin);
-    for (const auto& formatter : plugin->GetFormatters()) {
+    const auto formatters = plugin->GetFormatters();
+    for (const auto& formatter : formatters) {
+        const auto holder = _formatterPlugins.find(formatter->GetName());
+        if (holder != _formatterPlugins.end()) {
+            throw ZelmarException("Error while trying to register the plugin " + name +
+                                  "  this plugin has a formatter " + formatter->GetName() +
+                                  " that was already registered from the plugin " +
+                                  holder->second->GetName() + "  The functionality in " + name +
+                                  " will not be available until this issue is resolved.");
+        }
+    }
+    for (const auto& formatter : formatters) {
         _formatterPlugins[formatter->GetName()] = plugin;
     }
     _plugins.push_back(std::move(plugin));
 }
 
-void Dispatcher::RequireFormatterNamesFree(Plugin& plugin) {
-    for (const auto& formatter : plugin.GetFormatters()) {
-        const auto holder = _formatterPlugins.find(formatter->GetName());
-        if (holder != _formatterPlugins.end()) {
-            throw ZelmarException("Error while trying to register the plugin " + plugin.GetName() +
-                                  "  this plugin has a formatter " + formatter->GetName() +
-                                  " that was already registered from the plugin " +
-                                  holder->second->GetName() + " " +
-                                  UnavailableUntilResolved(plugin));
-        }
-    }
-}
-
 void Dispatcher::AddPlugin(const std::string& path) {
     if (const auto plugin = PluginForFile(path)) {
+        RequireRegularFile(path);
         plugin->Initialize();
         RegisterPlugin(plugin);
     }
 }
 
 void Dispatcher::AddExternalDirectoryInt(const std::string& directory, bool complain) {
-    std::vector<std::string> paths;
-    if (!ListDirectory(directory, paths)) {
+    const std::unique_ptr<DIR, CloseDirectory> entries(opendir(directory.c_str()));
+    if (!entries) {
         if (complain) {
             std::cerr << "Unable to open directory " << directory << " for plugin registration"
                       << std::endl;
         }
         return;
+    }
+    std::vector<std::string> paths;
+    if (const int error = ListDirectory(*entries, directory, paths)) {
+        std::cerr << "Unable to read directory " << directory
+                  << " for plugin registration: " << std::generic_category().message(error)
+                  << std::endl;
     }
     for (const std::string& path : paths) {
         try {

@@ -43,7 +43,9 @@ const std::string& SharedLibraryPlugin::GetName() const {
 
 void SharedLibraryPlugin::RegisterNamespaces(std::shared_ptr<Namespace> root) {
     if (_registerNamespaces) {
-        root->KeepAlive(_handle);
+        if (const auto treeRoot = std::dynamic_pointer_cast<RootNamespace>(root)) {
+            treeRoot->KeepAlive(_handle);
+        }
         _registerNamespaces(std::move(root));
     }
 }

@@ -35,6 +35,7 @@ CommandList::~CommandList() = default;
 std::shared_ptr<CommandList> CommandList::New(std::shared_ptr<Namespace> root) {
     auto command = std::make_shared<CommandList>(root.get());
     command->SetDescription("List all of the kelvash commands.");
+    command->SetReadOnly();
     command->SetDefaultOutputFormatter("table");
     command->SetDefaultOutputParameter("fields:KelVashCommand", "Namespace,Command,Description");
     command->SetDefaultOutputParameter("wrap-last", "true");

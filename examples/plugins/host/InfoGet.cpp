@@ -53,6 +53,7 @@ std::shared_ptr<MetaStruct> Machine(const utsname& names, const struct sysinfo& 
 
 InfoGet::InfoGet() {
     SetDescription("Show facts about this machine and its memory");
+    SetReadOnly();
     SetDefaultOutputFormatter("simple");
     SetDefaultOutputParameter("fields:Machine",
                               "Name,Architecture,Kernel,Processors,Uptime,Memory");

@@ -70,6 +70,7 @@ std::shared_ptr<MetaStruct> MountRow(const std::shared_ptr<MetaStruct>& shape, c
 
 MountList::MountList() {
     SetDescription("List the mounted file systems with their sizes");
+    SetReadOnly();
     SetDefaultOutputFormatter("table");
     SetDefaultOutputParameter("fields", "Path,Type,Size,Used,Available,State");
     SetDefaultOutputParameter("units:Mount.Size", "MiB");

@@ -83,6 +83,7 @@ std::shared_ptr<ParameterSpec> OptionalParameter(const char* name, const char* s
 
 ProcessList::ProcessList() {
     SetDescription("List the processes, or those that pass all given filters");
+    SetReadOnly();
     SetDefaultOutputFormatter("table");
     SetDefaultOutputParameter("fields", "Pid,User,State,Memory,Command");
     SetDefaultOutputParameter("units:Process.Memory", "KiB");

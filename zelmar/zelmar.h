@@ -22,6 +22,7 @@
 #include <zelmar/autocli/extension/ExtensionCommand.h>
 #include <zelmar/autocli/extension/Panic.h>
 #include <zelmar/autocli/extension/ShellCmd.h>
+#include <zelmar/autocli/extension/XmlOutput.h>
 #include <zelmar/autocli/extension/XmlPlugin.h>
 #include <zelmar/autocli/formatters/CliDispatcherHelpFormatter.h>
 #include <zelmar/autocli/formatters/CommandHelpFormatter.h>

@@ -1,6 +1,7 @@
 #include <zelmar/autocli/extension/Descriptor.h>
 #include <zelmar/autocli/extension/Rethrow.h>
-#include <zelmar/autocli/extension/XmlOutput.h>
+#include <zelmar/autocli/extension/ValueBuilder.h>
+#include <zelmar/autocli/extension/XmlUtil.h>
 
 using CallSpec::InputSpec;
 using CallSpec::OutputSpec;
@@ -8,79 +9,74 @@ using Zelmar::ZelmarException;
 
 namespace AutoCli {
 
-void ExtractMetaData(const xmlNode* node, CommandSpec& command) {
-    XmlUtil_ForEachChild(node, [&command](const xmlNode* entry) {
-        const std::string_view tag = XmlUtil_GetName(entry);
+void ExtractMetaData(const XmlNode& node, CommandSpec& command) {
+    for (const XmlNode& entry : node) {
         if (!XmlUtil_IsTagged(entry)) {
-            return;
+            continue;
         }
-        if (tag != "meta-data-entry") {
+        if (entry.name != "meta-data-entry") {
             throw ZelmarException(
                 "Found unexpected tag while building meta-data set.  Unexpected tag was: " +
-                std::string(tag));
+                std::string(entry.name));
         }
-        bool hasContent = false;
-        XmlUtil_ForEachChild(
-            entry, [&](const xmlNode* child) { hasContent = hasContent || child->content; });
-        if (!hasContent) {
-            return;
+        const auto content = XmlUtil_FindContent(entry);
+        if (!content) {
+            continue;
         }
-        const std::string name = XmlUtil_ExtractAttribute(entry, "name");
+        const std::string name(XmlUtil_ExtractAttribute(entry, "name"));
         if (name.empty()) {
             throw ZelmarException(
                 "Error parsing 'meta-data-entry', missing required attribute 'name'");
         }
-        command.AddMetaData(name, XmlUtil_GetContent(entry));
-    });
+        command.AddMetaData(name, std::string(*content));
+    }
 }
 
-void ExtractFormatParams(const xmlNode* node, CommandSpec& command) {
+void ExtractFormatParams(const XmlNode& node, CommandSpec& command) {
     bool hasFormatter = false;
-    XmlUtil_ForEachChild(node, [&](const xmlNode* child) {
-        const std::string_view tag = XmlUtil_GetName(child);
-        if (tag == "formatter") {
+    for (const XmlNode& child : node) {
+        if (child.name == "formatter") {
             if (hasFormatter) {
                 throw ZelmarException("Invalid plugin format.  Duplicate <formatter> tags found");
             }
             hasFormatter = true;
-            command.SetDefaultOutputFormatter(XmlUtil_GetContent(child));
-        } else if (tag == "format-parameter") {
-            command.SetDefaultOutputParameter(XmlUtil_ExtractAttribute(child, "name"),
-                                              XmlUtil_GetContent(child));
+            command.SetDefaultOutputFormatter(std::string(XmlUtil_GetContent(child)));
+        } else if (child.name == "format-parameter") {
+            command.SetDefaultOutputParameter(std::string(XmlUtil_ExtractAttribute(child, "name")),
+                                              std::string(XmlUtil_GetContent(child)));
         }
-    });
+    }
 }
 
-std::shared_ptr<InputSpec> ExtractInputSpec(const xmlNode* node) {
+std::shared_ptr<InputSpec> ExtractInputSpec(const XmlNode& node) {
     auto inputSpec = InputSpec::New();
-    XmlUtil_ForEachChild(node, [&inputSpec](const xmlNode* child) {
-        const std::string_view tag = XmlUtil_GetName(child);
-        if (tag == "parameter") {
+    for (const XmlNode& child : node) {
+        if (child.name == "parameter") {
             ExtractInputParam(child, *inputSpec);
-        } else if (tag == "context-supported") {
-            inputSpec->SetContextSupported(XmlUtil_GetContent(child));
+        } else if (child.name == "context-supported") {
+            inputSpec->SetContextSupported(std::string(XmlUtil_GetContent(child)));
         }
-    });
+    }
     return inputSpec;
 }
 
-std::shared_ptr<OutputSpec> ExtractOutputSpec(const xmlNode* node) {
+std::shared_ptr<OutputSpec> ExtractOutputSpec(const XmlNode& node) {
     auto outputSpec = OutputSpec::New();
     bool hasValue = false;
-    XmlUtil_ForEachChild(node, [&](const xmlNode* child) {
+    for (const XmlNode& child : node) {
         if (!XmlUtil_IsTagged(child)) {
-            return;
+            continue;
         }
         if (hasValue) {
             throw ZelmarException(
                 "Found more than one node under 'output-spec', where only one node is supported."
                 "  The tag was " +
-                std::string(XmlUtil_GetName(child)));
+                std::string(child.name));
         }
         hasValue = true;
-        WithContext([] { return "Unable to build output spec.  Error was "; },
+        WithContext("Unable to build output spec.  Error was ",
                     [&] { outputSpec->SetRootObject(XmlUtil_BuildMetaObject(child)); });
-    });
+    }
     return outputSpec;
 }
 

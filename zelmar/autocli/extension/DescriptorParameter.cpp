@@ -1,6 +1,7 @@
 #include <zelmar/autocli/extension/Descriptor.h>
 #include <zelmar/autocli/extension/Rethrow.h>
 #include <zelmar/autocli/extension/StreamInt.h>
+#include <zelmar/autocli/extension/XmlUtil.h>
 
 #include <algorithm>
 
@@ -17,7 +18,7 @@ namespace {
 
 // The row of a table for the word in a `type` attribute, or null.
 template <class Row, size_t Count>
-const Row* FindRow(const Row (&rows)[Count], const std::string& type) {
+const Row* FindRow(const Row (&rows)[Count], std::string_view type) {
     const Row* row = std::ranges::find(rows, type, &Row::type);
     return row == std::end(rows) ? nullptr : row;
 }
@@ -38,7 +39,7 @@ constexpr ParameterKind parameterKinds[] = {
 };
 
 // What fills a constraint from its data element tells whether there was any data.
-bool FillStringEnum(const xmlNode* node, ParameterConstraint& constraint) {
+bool FillStringEnum(const XmlNode& node, ParameterConstraint& constraint) {
     const auto entries = ExtractEnum(node);
     for (const auto& [value, description] : entries) {
         constraint.AddStringEnum(value, description);
@@ -46,7 +47,7 @@ bool FillStringEnum(const xmlNode* node, ParameterConstraint& constraint) {
     return !entries.empty();
 }
 
-bool FillIntEnum(const xmlNode* node, ParameterConstraint& constraint) {
+bool FillIntEnum(const XmlNode& node, ParameterConstraint& constraint) {
     const auto entries = ExtractEnum(node);
     for (const auto& [value, description] : entries) {
         const auto number = ReadStreamInt(value);
@@ -59,8 +60,8 @@ bool FillIntEnum(const xmlNode* node, ParameterConstraint& constraint) {
     return !entries.empty();
 }
 
-bool FillRegex(const xmlNode* node, ParameterConstraint& constraint) {
-    const std::string regex = XmlUtil_GetContent(node);
+bool FillRegex(const XmlNode& node, ParameterConstraint& constraint) {
+    const std::string regex(XmlUtil_GetContent(node));
     if (regex.empty()) {
         throw ZelmarException(
             "Error parsing regex from parameter constraint.Missing or empty 'regex' tag");
@@ -69,7 +70,7 @@ bool FillRegex(const xmlNode* node, ParameterConstraint& constraint) {
     return true;
 }
 
-bool FillRange(const xmlNode* node, ParameterConstraint& constraint) {
+bool FillRange(const XmlNode& node, ParameterConstraint& constraint) {
     const auto min = ReadStreamInt(XmlUtil_ExtractAttribute(node, "min"));
     const auto max = ReadStreamInt(XmlUtil_ExtractAttribute(node, "max"));
     if (!min || !max) {
@@ -85,7 +86,7 @@ struct ConstraintKind {
     std::string_view type;
     ParameterConstraintType constraintType;
     std::string_view dataTag;
-    bool (*fill)(const xmlNode* node, ParameterConstraint& constraint);
+    bool (*fill)(const XmlNode& node, ParameterConstraint& constraint);
 };
 
 constexpr ConstraintKind constraintKinds[] = {
@@ -109,13 +110,14 @@ struct ParameterText {
     std::string description;
 };
 
-ParameterText ReadParameterText(const xmlNode* node) {
-    return {XmlUtil_ExtractAttribute(node, "name"),
-            XmlUtil_ExtractAttribute(node, "type"),
-            XmlUtil_ExtractAttribute(node, "required"),
-            XmlUtil_ExtractAttribute(node, "secret"),
-            XmlUtil_ExtractAttribute(node, "shortname"),
-            XmlUtil_GetContentForChildByTag(node, "description")};
+ParameterText ReadParameterText(const XmlNode& node) {
+    const auto attribute = [&node](std::string_view name) {
+        return std::string(XmlUtil_ExtractAttribute(node, name));
+    };
+    return {
+        attribute("name"),      attribute("type"),
+        attribute("required"),  attribute("secret"),
+        attribute("shortname"), std::string(XmlUtil_GetContentForChildByTag(node, "description"))};
 }
 
 ParameterType CheckParameterText(const ParameterText& text) {
@@ -151,7 +153,7 @@ ParameterType CheckParameterText(const ParameterText& text) {
 
 }  // namespace
 
-void ExtractInputParam(const xmlNode* node, InputSpec& inputSpec) {
+void ExtractInputParam(const XmlNode& node, InputSpec& inputSpec) {
     ParameterText text = ReadParameterText(node);
     auto parameter = ParameterSpec::New(text.name, CheckParameterText(text));
     if (!text.shortName.empty()) {
@@ -162,32 +164,33 @@ void ExtractInputParam(const xmlNode* node, InputSpec& inputSpec) {
     if (text.secret == "true") {
         parameter->SetSecret(true);
     }
-    XmlUtil_ForEachChild(node, "constraint", [&parameter](const xmlNode* constraint) {
-        WithContext(
-            [&parameter] {
-                return "Unable to build parameter constraint for parameter " +
-                       parameter->GetName() + ".  Error was: ";
-            },
-            [&] { parameter->SetConstraint(ExtractParamConstraint(constraint)); });
-    });
+    const std::string context =
+        "Unable to build parameter constraint for parameter " + text.name + ".  Error was: ";
+    for (const XmlNode& child : node) {
+        if (child.name == "constraint") {
+            WithContext(context, [&] { parameter->SetConstraint(ExtractParamConstraint(child)); });
+        }
+    }
     inputSpec.AddParameter(parameter);
 }
 
-std::shared_ptr<ParameterConstraint> ExtractParamConstraint(const xmlNode* node) {
-    const std::string type = XmlUtil_ExtractAttribute(node, "type");
+std::shared_ptr<ParameterConstraint> ExtractParamConstraint(const XmlNode& node) {
+    const std::string_view type = XmlUtil_ExtractAttribute(node, "type");
     const ConstraintKind* kind = FindRow(constraintKinds, type);
     if (!kind) {
         throw ZelmarException(
             "Missing or invalid constraint 'type', must be one of [stringenum, intenum, regex,"
             " range] got '" +
-            type + "'");
+            std::string(type) + "'");
     }
     std::shared_ptr<ParameterConstraint> constraint;
     bool hasData = false;
-    XmlUtil_ForEachChild(node, kind->dataTag, [&](const xmlNode* data) {
-        constraint = ParameterConstraint::New(kind->constraintType);
-        hasData = kind->fill(data, *constraint) || hasData;
-    });
+    for (const XmlNode& child : node) {
+        if (child.name == kind->dataTag) {
+            constraint = ParameterConstraint::New(kind->constraintType);
+            hasData = kind->fill(child, *constraint) || hasData;
+        }
+    }
     if (!hasData) {
         throw ZelmarException(
             "Error parsing parameter constraint.  There was no data included inside the"
@@ -196,30 +199,29 @@ std::shared_ptr<ParameterConstraint> ExtractParamConstraint(const xmlNode* node)
     return constraint;
 }
 
-std::vector<std::pair<std::string, std::string>> ExtractEnum(const xmlNode* node) {
+std::vector<std::pair<std::string, std::string>> ExtractEnum(const XmlNode& node) {
     std::vector<std::pair<std::string, std::string>> entries;
-    XmlUtil_ForEachChild(node, [&entries](const xmlNode* child) {
+    for (const XmlNode& child : node) {
         if (!XmlUtil_IsTagged(child)) {
-            return;
+            continue;
         }
-        const std::string_view tag = XmlUtil_GetName(child);
-        if (tag != "enum-value") {
+        if (child.name != "enum-value") {
             throw ZelmarException(
                 "Found unexpected tag while building an enum.  Unexpected tag was: " +
-                std::string(tag));
+                std::string(child.name));
         }
-        const std::string value = XmlUtil_ExtractAttribute(child, "value");
-        XmlUtil_ForEachChild(child, [&](const xmlNode* text) {
-            if (!text->content) {
-                return;
+        const std::string_view value = XmlUtil_ExtractAttribute(child, "value");
+        for (const XmlNode& text : child) {
+            if (!text.content) {
+                continue;
             }
             if (value.empty()) {
                 throw ZelmarException(
                     "Error parsing 'enum-value', missing required attribute 'value'");
             }
-            entries.emplace_back(value, XmlUtil_GetText(text));
-        });
-    });
+            entries.emplace_back(value, *text.content);
+        }
+    }
     return entries;
 }
 

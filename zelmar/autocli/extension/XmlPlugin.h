@@ -49,14 +49,10 @@ public:
     static std::list<std::string> SplitPath(const std::string& path);
 
 private:
-    using Registration = std::pair<std::string, std::shared_ptr<NamespaceNode>>;
-
     void ReadFile();
-    void RequireFree(const std::shared_ptr<Namespace>& root, const Registration& registration);
-    static void Register(const std::shared_ptr<Namespace>& root, const Registration& registration);
 
     std::string _path;
-    std::vector<Registration> _registrations;
+    std::vector<std::pair<std::string, std::shared_ptr<NamespaceNode>>> _registrations;
 };
 
 }  // namespace AutoCli

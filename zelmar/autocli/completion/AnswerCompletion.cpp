@@ -190,15 +190,14 @@ Fields AnswerBash(Dispatcher& dispatcher, const Fields& question) {
     return answer;
 }
 
-// "name:description", in which a backslash tells the colons and backslashes of the name.
-std::string ZshEntry(const CompletionCandidate& candidate) {
-    std::string entry;
-    for (const char c : ShowControlCharacters(candidate.text)) {
-        entry += c == ':' || c == '\\' ? "\\" : "";
-        entry += c;
+// As _describe wants what stands in front of the colon that opens a description.
+std::string QuoteForDescribe(std::string_view text) {
+    std::string quoted;
+    for (const char c : text) {
+        quoted += c == ':' || c == '\\' ? "\\" : "";
+        quoted += c;
     }
-    return entry + (candidate.description.empty() ? "" : ":") +
-           ShowControlCharacters(candidate.description);
+    return quoted;
 }
 
 Fields AnswerZsh(Dispatcher& dispatcher, const Fields& question) {
@@ -206,12 +205,24 @@ Fields AnswerZsh(Dispatcher& dispatcher, const Fields& question) {
     Fields answer = {WordFor(completion.files), WordForBlank(completion.endsWord), completion.stem,
                      ShowControlCharacters(completion.message)};
     for (const CompletionCandidate& candidate : completion.candidates) {
-        answer.push_back(completion.stem + candidate.text);
+        answer.push_back(QuoteForDescribe(completion.stem + candidate.text));
     }
-    for (const CompletionCandidate& candidate : completion.candidates) {
-        answer.push_back(ZshEntry(candidate));
+    for (const auto& [text, description] : completion.candidates) {
+        answer.push_back(QuoteForDescribe(ShowControlCharacters(text)) +
+                         (description.empty() ? "" : ":") + ShowControlCharacters(description));
     }
     return answer;
+}
+
+// A tab would end the candidate for fish, and of the control characters it neutralises only those
+// of ASCII. No candidate is better than a wrong one.
+bool SuitsFish(std::string_view text) {
+    for (; !text.empty(); text.remove_prefix(1)) {
+        if (text[0] == '\t' || FindControlCharacter(text).code >= 0x80) {
+            return false;
+        }
+    }
+    return true;
 }
 
 Fields AnswerFish(Dispatcher& dispatcher, const Fields& question) {
@@ -219,8 +230,7 @@ Fields AnswerFish(Dispatcher& dispatcher, const Fields& question) {
     Fields answer = {WordFor(completion.files), completion.stem,
                      ShowControlCharacters(completion.message)};
     for (const auto& [text, description] : completion.candidates) {
-        // A tab would end the candidate for fish: no candidate is better than a wrong one.
-        if (text.find('\t') == std::string::npos) {
+        if (SuitsFish(text)) {
             answer.push_back(completion.stem + text + "\t" + ShowControlCharacters(description));
         }
     }

@@ -188,8 +188,9 @@ std::string QuoteOne(char c, Quote quote) {
     return (IsHarmless(c) ? "" : "\\") + std::string(1, c);
 }
 
-std::string_view QuoteMark(Quote quote) {
-    return quote == Quote::Single ? "'" : quote == Quote::Double ? "\"" : "";
+// What closes the quote.
+std::string QuoteMark(Quote quote) {
+    return quote == Quote::None ? "" : quote == Quote::Double ? "\"" : "'";
 }
 
 }  // namespace
@@ -198,9 +199,10 @@ BashLine ReadBashLine(std::string_view line, std::string_view wordBreaks) {
     return Reader(line, wordBreaks).Read();
 }
 
-// Other quotes are left for a control character and opened again behind it.
+// Other quotes are left for a control character and opened again behind it. The line editor closes
+// an open quote itself, unless the last character is such a quote already.
 std::string QuoteForBash(std::string_view text, Quote quote) {
-    const std::string_view mark = QuoteMark(quote);
+    const std::string mark = QuoteMark(quote);
     std::string quoted;
     while (!text.empty()) {
         const size_t length = FindControlCharacter(text).length;
@@ -210,12 +212,10 @@ std::string QuoteForBash(std::string_view text, Quote quote) {
             continue;
         }
         const std::string escapes = AnsiEscapes(text.substr(0, length));
-        quoted += quote == Quote::Ansi
-                      ? escapes
-                      : std::string(mark) + "$'" + escapes + "'" + std::string(mark);
+        quoted += quote == Quote::Ansi ? escapes : mark + "$'" + escapes + "'" + mark;
         text.remove_prefix(length);
     }
-    return quoted;
+    return quoted.ends_with(mark) ? quoted + mark : quoted;
 }
 
 }  // namespace AutoCli

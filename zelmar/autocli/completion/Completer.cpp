@@ -253,8 +253,11 @@ void Completer::CompleteValue(const CommandSpec& command, const ParameterSpec& p
     }
     const std::string source = command.GetValuesSource(parameter.GetName());
     if (completion.candidates.empty() && !source.empty()) {
+        std::set<std::string> seen;
         for (std::string& value : ExistingValues(_dispatcher, source)) {
-            Add(completion, std::move(value));
+            if (seen.insert(value).second) {
+                Add(completion, std::move(value));
+            }
         }
     }
     if (completion.candidates.empty()) {

@@ -47,13 +47,14 @@
 #
 # Text may hold any bytes or characters: what XML cannot carry is shown, as \x1b.
 #
-# Needs Perl 5.14 and nothing else.
+# Needs Perl 5.20 and nothing else.
 package Kelvash;
 
 use strict;
 use warnings;
 use Exporter 'import';
 use File::Spec;
+use List::Util qw(pairkeys pairs);
 
 our @EXPORT = qw(list progress run structure);
 
@@ -62,8 +63,8 @@ sub list { return { word => 'list', item => shift } }
 sub structure {
     my ($name, $fields) = @_;
     my %structure = (word => 'structure', name => $name, order => [], fields => {}, units => {});
-    for (my $i = 0; $i < @$fields; $i += 2) {
-        my ($field, $type) = @$fields[$i, $i + 1];
+    for (pairs @$fields) {
+        my ($field, $type) = @$_;
         ($type, $structure{units}{$field}) = split ' ', $type, 2 if !ref $type;
         push @{$structure{order}}, $field;
         $structure{fields}{$field} = $type;
@@ -74,7 +75,7 @@ sub structure {
 sub run {
     my %command = @_;
     my %parameters = @{$command{parameters} ||= []};
-    $command{order} = [@{$command{parameters}}[grep { $_ % 2 == 0 } 0 .. $#{$command{parameters}}]];
+    $command{order} = [pairkeys @{$command{parameters}}];
     my $describe = @ARGV == 1 && $ARGV[0] eq '--descriptor';
     open my $result, '>&', \*STDOUT or die "Cannot keep standard output: $!\n";
     open STDOUT, '>&', \*STDERR or die "Cannot use the error stream: $!\n";
@@ -270,9 +271,7 @@ sub _escape { return _show($_[0]) =~ s/([&<>"\r])/$entity{$1}/gr }
 sub _element {
     my ($tag, $attributes, @children) = @_;
     my $head = $tag;
-    for (my $i = 0; $i < @$attributes; $i += 2) {
-        $head .= " $attributes->[$i]=\"" . _escape($attributes->[$i + 1]) . '"';
-    }
+    $head .= " $_->[0]=\"" . _escape($_->[1]) . '"' for pairs @$attributes;
     return "<$head/>\n" if !@children;
     return "<$head>" . _escape(join ' ', split ' ', ${$children[0]}) . "</$tag>\n" if ref $children[0];
     return "<$head>\n" . join('', map { s/^/  /mgr } @children) . "</$tag>\n";
@@ -294,8 +293,7 @@ sub _descriptor {
     push @notes, "values:$_", $parameters->{$_}{values_from}
         for grep { $parameters->{$_}{values_from} } @{$command->{order}};
     push @notes, 'example', $_ for @{$command->{examples} || []};
-    my @entries = map { _element('meta-data-entry', [name => $notes[2 * $_]], \$notes[2 * $_ + 1]) }
-        0 .. $#notes / 2;
+    my @entries = map { _element('meta-data-entry', [name => $_->[0]], \$_->[1]) } pairs @notes;
 
     my @open = grep { !$parameters->{$_}{secret} } @{$command->{order}};
     my $execute = join ' ', "PERL_BADLANG=0 $script", map { _form($_, $parameters->{$_}) } @open;
@@ -321,11 +319,10 @@ sub _parameter {
         my ($least, $most) = @{$parameter->{range}};
         $constraint = ['range', _element('range', [min => $least, max => $most])];
     } elsif ($parameter->{values}) {
-        my @values = @{$parameter->{values}};
         my ($kind) = $parameter->{type} =~ /^(\w+)/;
         $constraint = ["${kind}enum", _element('enum', [], map {
-            _element('enum-value', [value => $values[2 * $_]], \$values[2 * $_ + 1])
-        } 0 .. $#values / 2)];
+            _element('enum-value', [value => $_->[0]], \$_->[1])
+        } pairs @{$parameter->{values}})];
     } elsif ($parameter->{type} =~ /^string/) {
         my $pattern = $parameter->{pattern} // _safe($parameter);
         $constraint = ['regex', _element('regex', [], \$pattern)];
@@ -367,10 +364,10 @@ sub _sample {
 
 sub _formats {
     my ($type) = @_;
-    my @structures = _structures($type);
-    my $formatter = @structures && $type->{word} eq 'list' ? 'table' : 'simple';
+    my $formatter = _is_table($type) ? 'table' : 'simple';
     my @formats = _element('formatter', [], \$formatter);
-    for my $structure (@structures) {
+    my %seen;
+    for my $structure (grep { !$seen{$_->{name}}++ } _structures($type)) {
         my $fields = join ',', @{$structure->{order}};
         push @formats, _element('format-parameter', [name => "fields:$structure->{name}"], \$fields);
         for my $field (grep { defined $structure->{units}{$_} } @{$structure->{order}}) {
@@ -379,6 +376,12 @@ sub _formats {
         }
     }
     return @formats;
+}
+
+sub _is_table {
+    my ($type) = @_;
+    return ref $type && $type->{word} eq 'list' && ref $type->{item}
+        && !grep { ref } values %{$type->{item}{fields}};
 }
 
 sub _structures {

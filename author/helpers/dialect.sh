@@ -1,9 +1,8 @@
 # What a command script prints, made easy. A script that stands beside this file begins with
 #
-#     . "${0%"${0##*/}"}dialect.sh"
+#     . "$(dirname "$0")/dialect.sh"
 #
-# (what stands ahead of the script's name in $0, also when it is called as `sh -x script`), and then
-# has:
+# and then has:
 #
 #     fail TEXT                   tell what is wrong as an ERROR: line and end the script;
 #                                 such a line counts only at the very start of the output
@@ -103,15 +102,15 @@ dialect() {
 progress() {
     [ -t 2 ] || return 0
     [ "$1" -lt "$2" ] || { _clear_bar; return 0; }
-    _bar='##############################'
+    _bar='##############################' _bar_is_drawn=yes
     while [ ${#_bar} -gt $((30 * $1 / $2)) ]; do _bar=${_bar#?}; done
     printf '\r[%-30s] %3d %% %.36s\033[K' "$_bar" $((100 * $1 / $2)) \
         "$(printf %s "$3" | LC_ALL=C tr -c ' -~' '?')" >&2
 }
 
 _clear_bar() {
-    [ -z "${_bar-}" ] || printf '\r\033[K' >&2
-    _bar=
+    [ -z "${_bar_is_drawn-}" ] || printf '\r\033[K' >&2
+    _bar_is_drawn=''
 }
 
 # An exit runs the END rules, and this one is the first of them.

@@ -198,10 +198,8 @@ class _Command:
         self.shape.describe(add(command, "output-spec"), add)
 
         formats = add(command, "format-parameters")
-        structures = list(self.shape.structures())
-        is_table = isinstance(self.shape, _List) and structures
-        add(formats, "formatter", "table" if is_table else "simple")
-        for shape in structures:
+        add(formats, "formatter", "table" if self.shape.is_flat() else "simple")
+        for shape in {shape.name: shape for shape in self.shape.structures()}.values():
             add(formats, "format-parameter", ",".join(shape.fields), name=f"fields:{shape.name}")
             for name, unit in shape.units.items():
                 add(formats, "format-parameter", unit, name=f"units:{shape.name}.{name}")
@@ -331,6 +329,9 @@ class _Scalar:
     def __init__(self, kind):
         self.kind, self.word = kind, _WORDS[kind]
 
+    def is_flat(self):
+        return False
+
     def structures(self):
         return ()
 
@@ -353,6 +354,11 @@ class _Scalar:
 class _List:
     def __init__(self, item):
         self.item, self.word = item, "list"
+
+    def is_flat(self):
+        """Whether it is a table: rows of cells."""
+        return isinstance(self.item, _Structure) and all(
+            isinstance(field, _Scalar) for field in self.item.fields.values())
 
     def structures(self):
         return self.item.structures()
@@ -385,6 +391,9 @@ class _Structure:
             for extra in _bare(hints[field.name])[1]:
                 if isinstance(extra, Unit):
                     self.units[field.name] = extra
+
+    def is_flat(self):
+        return False
 
     def structures(self):
         yield self

@@ -16,6 +16,10 @@ namespace AutoCli {
 
 namespace {
 
+bool IsBlank(char c) {
+    return c == ' ' || c == '\t';
+}
+
 bool IsNameCharacter(char c) {
     return Ascii::IsAlnum(c) || c == '-';
 }
@@ -86,40 +90,10 @@ std::string Dump(const std::vector<OptionParser::Option>& options) {
     return text;
 }
 
-bool IsBlank(char c) {
-    return c == ' ' || c == '\t';
-}
-
 std::string WithoutQuotes(std::string_view text) {
     std::string word(text);
     std::erase(word, '"');
     return word;
-}
-
-// Blanks ahead of the first word are passed over by their number, wherever quotes stand among them:
-// each of these quotes lets one more of the blanks behind it into the word.
-std::vector<std::string> SplitLine(std::string_view line) {
-    const size_t first = std::min(line.find_first_not_of(" \t\""), line.size());
-    if (line.substr(first).starts_with('#')) {
-        return {};
-    }
-    const std::string_view lead = line.substr(0, first);
-    auto start = static_cast<size_t>(std::ranges::count_if(lead, IsBlank));
-    bool inQuote = (lead.size() - start) % 2 == 1;
-    std::vector<std::string> words;
-    for (size_t i = first; i < line.size(); ++i) {
-        if (line[i] == '"') {
-            inQuote = !inQuote;
-        } else if (IsBlank(line[i]) && !inQuote) {
-            words.push_back(WithoutQuotes(line.substr(start, i - start)));
-            start = std::min(line.find_first_not_of(" \t", i), line.size());
-            i = start - 1;
-        }
-    }
-    if (std::string last = WithoutQuotes(line.substr(start)); !last.empty()) {
-        words.push_back(std::move(last));
-    }
-    return words;
 }
 
 // Where the result leaves another way, a prompt goes to the terminal that is typed on.
@@ -231,6 +205,32 @@ bool OptionParser::ParseParameter(const std::string& token, std::string& name, s
 
 bool OptionParser::IsParameter(const std::string& token) {
     return ReadOption(token).has_value();
+}
+
+// Blanks ahead of the first word are passed over by their number, wherever quotes stand among them:
+// each of these quotes lets one more of the blanks behind it into the word.
+std::vector<std::string> OptionParser::SplitLine(std::string_view line) {
+    const size_t first = std::min(line.find_first_not_of(" \t\""), line.size());
+    if (line.substr(first).starts_with('#')) {
+        return {};
+    }
+    const std::string_view lead = line.substr(0, first);
+    auto start = static_cast<size_t>(std::ranges::count_if(lead, IsBlank));
+    bool inQuote = (lead.size() - start) % 2 == 1;
+    std::vector<std::string> words;
+    for (size_t i = first; i < line.size(); ++i) {
+        if (line[i] == '"') {
+            inQuote = !inQuote;
+        } else if (IsBlank(line[i]) && !inQuote) {
+            words.push_back(WithoutQuotes(line.substr(start, i - start)));
+            start = std::min(line.find_first_not_of(" \t", i), line.size());
+            i = start - 1;
+        }
+    }
+    if (std::string last = WithoutQuotes(line.substr(start)); !last.empty()) {
+        words.push_back(std::move(last));
+    }
+    return words;
 }
 
 bool OptionParser::ParseString(const std::string& line) {

@@ -7,6 +7,7 @@
 #include <optional>
 #include <stack>
 #include <string>
+#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -37,9 +38,11 @@ public:
     /// argv[0] becomes the dispatcher's name.
     void ParseArgv(int argc, const char* const* argv);
     void ParseVector(std::vector<std::string> words);
-    /// Splits a line of a command file into words and parses them: blanks and tabs separate, double
-    /// quotes group and vanish, and "#" in front of the first word opens a comment. True when there
-    /// was no word, and then nothing was parsed.
+    /// The words of a line of a command file: blanks and tabs separate, double quotes group and
+    /// vanish, and "#" in front of the first word opens a comment. A last word that is empty is
+    /// none.
+    static std::vector<std::string> SplitLine(std::string_view line);
+    /// Splits a line and parses its words. True when there was none, and then nothing was parsed.
     bool ParseString(const std::string& line);
     /// The first word lies on top.
     void ParseStack(std::stack<std::string> words);

@@ -2,6 +2,8 @@
 
 #include "Session.h"
 
+#include "../StandardStreams.h"
+
 #include <zelmar/zelmar.h>
 
 #include <unistd.h>
@@ -79,6 +81,9 @@ int Run(int argc, char** argv) {
 }  // namespace
 
 int main(int argc, char** argv) {
+    FillClosedStreams();
+    CheckStandardOutputAtExit();
+    std::signal(SIGCHLD, SIG_DFL);  // a command waits for its own, whatever our caller ignores
     try {
         return Run(argc, argv);
     } catch (const std::exception& error) {

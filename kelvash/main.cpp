@@ -1,16 +1,14 @@
+#include "Environment.h"
 #include "StandardStreams.h"
 
 #include <zelmar/zelmar.h>
 
 #include <csignal>
 #include <cstdlib>
-#include <filesystem>
 #include <iostream>
 #include <optional>
 
 namespace {
-
-constexpr const char* defaultPluginDirectory = "/usr/lib/norvane/kelvash";
 
 int ReportAndFail(const char* message) {
     std::cerr << "Errors: \n" << message << std::endl;
@@ -28,13 +26,9 @@ int main(int argc, char** argv) {
     std::optional<AutoCli::CliDispatcher> dispatcher;
     try {
         dispatcher.emplace();
-        std::error_code noError;
-        // A machine without any plugins is nothing to complain of on every call.
-        if (std::filesystem::exists(defaultPluginDirectory, noError)) {
-            dispatcher->AddDefaultDirectories();
-        }
+        SetUpFromEnvironment(*dispatcher);
         AutoCli::AutoCli_AnswerCompletion(*dispatcher);
-        dispatcher->HandleArgvInput(argc, argv);
+        std::exit(dispatcher->Run(argc, argv));  // without taking the tree down first
     } catch (const std::exception& error) {
         return ReportAndFail(error.what());
     } catch (...) {

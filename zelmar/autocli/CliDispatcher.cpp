@@ -1,5 +1,6 @@
 #include <zelmar/ZelmarException.h>
 #include <zelmar/autocli/CliDispatcher.h>
+#include <zelmar/autocli/Hints.h>
 #include <zelmar/autocli/OptionParser.h>
 #include <zelmar/autocli/formatters/BlockOutput.h>
 #include <zelmar/autocli/formatters/CliDispatcherHelpFormatter.h>
@@ -20,7 +21,9 @@
 #include <iostream>
 #include <string_view>
 #include <system_error>
+#include <utility>
 
+using CallSpec::Input;
 using CallSpec::Output;
 using MetaObj::MetaList;
 using MetaObj::MetaStruct;
@@ -35,6 +38,9 @@ constexpr std::array<std::string_view, 7> dispatcherOptions = {
     "h", "help", "formatter", "plugin-dir", "plugin", "format-param", "screen-width"};
 
 constexpr int widestScreen = 9999;
+
+// Ends a run where it would otherwise end the process.
+struct UsagePrinted {};
 
 bool IsKeyCharacter(char c) {
     return Ascii::IsAlnum(c) || std::string_view(" .-:").find(c) != std::string_view::npos;
@@ -125,6 +131,32 @@ void CliDispatcher::HandleArgvInput(int argc, const char* const* argv) {
     std::exit(HandleOptions(parser, true) ? EXIT_SUCCESS : EXIT_FAILURE);
 }
 
+int CliDispatcher::Run(int argc, const char* const* argv) {
+    OptionParser parser;
+    parser.ParseArgv(argc, argv);
+    return Run(parser, true);
+}
+
+int CliDispatcher::Run(OptionParser& parser, bool allowInput) {
+    const auto complain = [](const char* message) {
+        std::cerr << "Errors: \n" << message << std::endl;
+    };
+    const bool ranBefore = std::exchange(_runs, true);
+    int status = EXIT_FAILURE;
+    try {
+        status = HandleOptions(parser, allowInput) ? EXIT_SUCCESS : EXIT_FAILURE;
+    } catch (const UsagePrinted&) {
+        // which is no success
+    } catch (const std::exception& error) {
+        complain(error.what());
+        PrintHint(parser);
+    } catch (...) {
+        complain("Unknown error");
+    }
+    _runs = ranBefore;
+    return status;
+}
+
 bool CliDispatcher::HandleOptions(OptionParser& parser, bool allowInput) {
     const auto output = CommandOutput::New();
     TakeParseErrors(parser, *output);
@@ -135,6 +167,9 @@ bool CliDispatcher::HandleOptions(OptionParser& parser, bool allowInput) {
     _dispatcherName = parser.GetDispatcher();
     FormatParameters overrides;
     if (!HandleDispatcherOptions(parser, overrides, output)) {
+        if (_runs) {
+            throw UsagePrinted();
+        }
         std::exit(EXIT_FAILURE);
     }
     DisplayContext context;
@@ -151,7 +186,24 @@ bool CliDispatcher::HandleOptions(OptionParser& parser, bool allowInput) {
         PrintChildren(node ? node : GetRootNamespace(), output);
     }
     PrintError(output);
+    if (output->HasError()) {
+        PrintHint(parser);
+    }
     return command && !output->HasError();
+}
+
+void CliDispatcher::PrintHint(OptionParser& parser) {
+    if (!_givesHints || isatty(STDERR_FILENO) == 0) {
+        return;
+    }
+    try {
+        const std::string hint = FindHint(*this, parser, dispatcherOptions);
+        if (!hint.empty()) {
+            std::cerr << hint << std::endl;
+        }
+    } catch (const std::exception&) {
+        // A declaration that cannot be built has been told of.
+    }
 }
 
 // What the line says beside `--input`, complaints about it included, does not reach the stream.
@@ -212,7 +264,7 @@ void CliDispatcher::HandleCommand(OptionParser& parser, Command& command,
     if (output->HasError()) {
         return;
     }
-    const std::string& formatter = overrides.GetFormatter();
+    const std::string formatter = ChosenFormatter(command, *input, overrides);
     if (!formatter.empty() && !HasFormatter(formatter)) {
         // Nor does it for a result that nothing can print. A faulty input is told first.
         input->SetInputSpec(spec);
@@ -224,12 +276,24 @@ void CliDispatcher::HandleCommand(OptionParser& parser, Command& command,
     }
 }
 
+// What the line names; else, for a command that prints by itself, what the user has set for all.
+std::string CliDispatcher::ChosenFormatter(const Command& command, const Input& input,
+                                           const FormatParameters& overrides) const {
+    const bool printsResult = !input.HasParameter("help") && !input.HasParameter("h") &&
+                              !command.GetDefaultOutputFormatParameters().GetFormatter().empty();
+    return overrides.GetFormatter().empty() && printsResult ? _defaultFormatter
+                                                            : overrides.GetFormatter();
+}
+
 void CliDispatcher::PrintOutput(const std::shared_ptr<CommandInput>& input,
                                 const std::shared_ptr<CommandOutput>& output,
                                 const FormatParameters& overrides, DisplayContext& context) {
     FormatParameters format;
     if (output->GetOutputType() == Output::OutputTypeNormal) {
         format = GetDefaultOutputFormatParameters(input, output);
+        if (!format.GetFormatter().empty() && !_defaultFormatter.empty()) {
+            format.SetFormatter(_defaultFormatter);
+        }
     } else if (output->GetOutputType() == Output::OutputTypeHelp) {
         format = GetHelpFormatParams();
     }

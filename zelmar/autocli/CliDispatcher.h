@@ -24,8 +24,25 @@ public:
     /// and for a faulty declaration, and what a formatter throws.
     [[noreturn]] void HandleArgvInput(int argc, const char* const* argv);
 
-    /// Handles one parsed command line; true means success. Ends the process with status 1 behind
-    /// the usage text. `allowInput` tells whether `--input` may be heeded.
+    /// The same, for a host that goes on: gives the status, and throws nothing. Whatever is thrown
+    /// is told on the error stream below "Errors: ", "Unknown error" where it is no standard
+    /// exception. The second takes a line that is parsed already; `allowInput` tells whether
+    /// `--input` may be heeded.
+    int Run(int argc, const char* const* argv);
+    int Run(OptionParser& parser, bool allowInput);
+
+    /// Behind the errors of a line, `HandleOptions` and `Run` may print one more line that helps
+    /// on, such as the nearest name to a mistyped one: where the error stream is a terminal, and
+    /// unless it is turned off here.
+    void SetHints(bool wanted) { _givesHints = wanted; }
+
+    /// The formatter for commands that would print through another one; empty, as on a new
+    /// dispatcher, for the command's own. `--formatter` wins. Help, listings and commands that
+    /// print nothing by themselves stay as they are.
+    void SetDefaultFormatter(std::string name) { _defaultFormatter = std::move(name); }
+
+    /// Handles one parsed command line; true means success. Behind the usage text it ends the
+    /// process with status 1.
     bool HandleOptions(OptionParser& parser, bool allowInput);
     /// Runs each line of a stream; the result is that of the last line that held words, and true
     /// when there was none. A stream that fails ends with "Unable to read the input: <reason>" on
@@ -56,10 +73,16 @@ private:
     void PrintOutput(const std::shared_ptr<CommandInput>& input,
                      const std::shared_ptr<CommandOutput>& output,
                      const FormatParameters& overrides, DisplayContext& context);
+    [[nodiscard]] std::string ChosenFormatter(const Command& command, const CallSpec::Input& input,
+                                              const FormatParameters& overrides) const;
+    void PrintHint(OptionParser& parser);
     void PrintUsage() const;
     void LoadPlugins(const OptionParser& parser);
 
     std::string _dispatcherName;
+    std::string _defaultFormatter;
+    bool _givesHints = true;
+    bool _runs = false;    // within `Run`, which does not end the process
     int _screenWidth = 0;  // what `--screen-width` said last; out of bounds it has no effect
 };
 

@@ -120,16 +120,16 @@ def _errors(fault):
 
 
 def _place(fault):
-    """The last line of the script that led to the fault, not one of a module that it uses."""
-    script = getattr(sys.modules["__main__"], "__file__", None)
-    place = None
+    """The last line of the script that led to the fault, or else of a module that it uses."""
+    script = getattr(sys.modules["__main__"], "__file__", sys.argv[0])
+    lines = {}
     trace = fault.__traceback__
     while trace:
-        file = trace.tb_frame.f_code.co_filename
-        if file == script or place is None:
-            place = f"{os.path.basename(file)}:{trace.tb_lineno}"
+        lines[trace.tb_frame.f_code.co_filename] = trace.tb_lineno
         trace = trace.tb_next
-    return place
+    lines.pop(__file__, None)
+    file = script if script in lines or not lines else list(lines)[-1]
+    return ":".join(str(part) for part in (os.path.basename(file), lines.get(file)) if part)
 
 
 class _Command:
@@ -321,7 +321,8 @@ def _shape(hint, outer=()):
         item = _shape(arguments[0], outer)
         if not isinstance(item, _List):
             return _List(item)
-    raise TypeError(f"{kind} is nothing that can be printed: int, bool, str, a dataclass that does"
+    name = kind.__name__ if isinstance(kind, type) else kind
+    raise TypeError(f"{name} cannot be printed: what can is int, bool, str, a dataclass that does"
                     " not hold itself, or a list of one of these")
 
 

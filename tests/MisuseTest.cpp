@@ -8,10 +8,17 @@
 
 #include <gtest/gtest.h>
 
-using namespace AutoCli;
-using namespace CallSpec;
-using namespace MetaObj;
+using CallSpec::Input;
+using CallSpec::InputSpec;
+using CallSpec::OutputSpec;
+using CallSpec::ParameterConstraint;
+using CallSpec::ParameterSpec;
+using MetaObj::MetaInt;
+using MetaObj::MetaList;
+using MetaObj::MetaStruct;
+using MetaObj::MetaType;
 
+namespace AutoCli {
 namespace {
 
 using Cases = std::vector<std::pair<std::function<void()>, std::string>>;
@@ -86,7 +93,7 @@ TEST(Misuse, OfValues) {
 }
 
 std::shared_ptr<ParameterSpec> Named(const char* name, const char* shortName = nullptr,
-                                     ParameterType type = ParameterTypeInt) {
+                                     CallSpec::ParameterType type = CallSpec::ParameterTypeInt) {
     auto parameter = ParameterSpec::New(name, type);
     if (shortName) {
         parameter->SetShortName(shortName);
@@ -95,16 +102,16 @@ std::shared_ptr<ParameterSpec> Named(const char* name, const char* shortName = n
 }
 
 TEST(Misuse, OfDeclarations) {
-    const auto words = ParameterConstraint::New(ConstraintTypeStringEnum);
-    const auto numbers = ParameterConstraint::New(ConstraintTypeIntEnum);
+    const auto words = ParameterConstraint::New(CallSpec::ConstraintTypeStringEnum);
+    const auto numbers = ParameterConstraint::New(CallSpec::ConstraintTypeIntEnum);
     words->AddStringEnum("fast", "in a hurry");
     numbers->AddIntEnum(3);
-    const auto range = ParameterConstraint::New(ConstraintTypeIntRange);
+    const auto range = ParameterConstraint::New(CallSpec::ConstraintTypeIntRange);
     range->SetIntRange(5, 5);
     const auto spec = InputSpec::New();
     spec->AddParameter(Named("size", "s"));
-    spec->AddParameter(Named("flag", "f", ParameterTypeFlag));
-    spec->AddParameter(Named("list", "l", ParameterTypeIntList));
+    spec->AddParameter(Named("flag", "f", CallSpec::ParameterTypeFlag));
+    spec->AddParameter(Named("list", "l", CallSpec::ParameterTypeIntList));
     const auto input = Input::New();
     const auto undeclared = Input::New();
     undeclared->AddParameter("size", "1");
@@ -197,3 +204,4 @@ TEST(Misuse, OfTheTree) {
 }
 
 }  // namespace
+}  // namespace AutoCli

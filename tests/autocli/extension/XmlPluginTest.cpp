@@ -208,7 +208,12 @@ TEST_F(XmlPluginTest, ReadsOtherEncodings) {
 
 // What looks like an address is the name of a file, too.
 TEST_F(XmlPluginTest, FetchesNothing) {
-    EXPECT_THROW(XmlPlugin::New("http://127.0.0.1:9/x.xml")->Initialize(), Zelmar::ZelmarException);
+    std::ofstream(_path) << "<p>" << version << "<commands/></p>";
+    for (const std::string& address :
+         std::vector<std::string>{"file:" + _path, "file://" + _path, "/%2e/" + _path, "-",
+                                  "http://127.0.0.1:9/x.xml"}) {
+        EXPECT_THROW(XmlPlugin::New(address)->Initialize(), Zelmar::ZelmarException) << address;
+    }
     EXPECT_EQ(LoadText("<!DOCTYPE p SYSTEM 'http://127.0.0.1:9/x' [<!ENTITY e SYSTEM '" + _path +
                        "'>]><p><version>&e;1.0.0</version><commands/></p>"),
               nothing);
@@ -238,7 +243,8 @@ TEST_F(XmlPluginTest, PutsWhatItHasIntoOneTree) {
         {NamespaceText("B", "B"),
          "Invalid name for namespace 'B', must be a name consisting of letters and numbers and must"
          " conform to 'camel' casing."},
-        {"<namespaces>" + node("t", "1") + node("t", "1") + "</namespaces>", nothing},
+        {"<namespaces>" + node("t", "1") + node("t.s", "1") + node("t", "1") + "</namespaces>",
+         nothing},
         {"<namespaces>" + node("u", "1") + node("u", "2") + "</namespaces>",
          "Duplicate registration in namespace  attempt to register two objects with name u"},
     };

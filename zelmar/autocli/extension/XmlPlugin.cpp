@@ -81,7 +81,7 @@ public:
         if (names != _names) {
             _names = names;
             _parent = nullptr;
-            _parent = _root->ResolveNode(names);
+            _parent = names.empty() ? _root : _root->ResolveNode(names);
         }
         return _parent;
     }

@@ -25,25 +25,25 @@
 #         },
 #     );
 #
-# Called with --descriptor it prints the descriptor of the command backup.list. Called by the command
-# it gets `--folder backups --min-size 3`, calls the code with the options that were given and prints
-# what that returns, when the whole of it fits what is declared: 'int', 'bool' (1, 0 or ''),
-# 'string', structure(NAME => [FIELD => TYPE...]) as a hash, or list(TYPE) as an array, as deep as it
-# may be. Words behind a type are the unit of the field. What does not fit is told with its place, as
-# is whatever the code dies of, in ERROR: lines; a text with a line feed at its end has no place, as
-# everywhere in Perl. What the script prints by the way goes to the error stream.
+# Called with --descriptor it prints the descriptor of the command backup.list. Called by the
+# command it gets `--folder backups --min-size 3`, calls the code with the options that were given
+# and prints what that returns, when the whole of it fits what is declared: 'int', 'bool' (1, 0 or
+# ''), 'string', structure(NAME => [FIELD => TYPE...]) as a hash, or list(TYPE) as an array, as
+# deep as it may be. Words behind a type are the unit of the field. What does not fit is told with
+# its place, as is whatever the code dies of, in ERROR: lines; a text with a line feed at its end
+# has no place, as everywhere in Perl. What the script prints by the way goes to the error stream.
 #
-# A parameter has a type (string, int, bool, flag, or string-list, int-list, bool-list for one that
-# may be repeated) and a description; it may have short, required, range, pattern, values (pairs of a
-# value and what it means), values_from ("account user list:Name") and secret. A secret comes through
-# standard input, of which no process list tells. Besides, run knows namespaces (a hash of what is
-# below each) and examples (texts "ARGUMENTS : SENTENCE").
+# A parameter has a type (string, int, bool, flag, or string-list, int-list, bool-list for one
+# that may be repeated) and a description; it may have short, required, range, pattern, values
+# (pairs of a value and what it means), values_from ("account user list:Name") and secret. A
+# secret comes through standard input, of which no process list tells. Besides, run knows
+# namespaces (a hash of what is below each) and examples (texts "ARGUMENTS : SENTENCE").
 #
 #     progress(DONE, TOTAL, TEXT)   draws a bar on the error stream if that is a terminal; it goes
 #                                   when all is done
 #
-# In a descriptor, PERL_BADLANG=0 stands ahead of the script: kelvash sets LANG=en_US.UTF-8 where there
-# is no LANG, and Perl warns of a locale that the machine does not have.
+# In a descriptor, PERL_BADLANG=0 stands ahead of the script: kelvash sets LANG=en_US.UTF-8 where
+# there is no LANG, and Perl warns of a locale that the machine does not have.
 #
 # Text may hold any bytes or characters: what XML cannot carry is shown, as \x1b.
 #
@@ -104,7 +104,8 @@ sub progress {
     my $bar = '';
     if ($done < $total) {
         ($text = substr($text // '', 0, 36)) =~ s/[^ -~]/?/g;
-        $bar = sprintf '[%-30s] %3d %% %s', '#' x int(30 * $done / $total), 100 * $done / $total, $text;
+        my $share = $done / $total;
+        $bar = sprintf '[%-30s] %3d %% %s', '#' x int(30 * $share), 100 * $share, $text;
     }
     print STDERR "\r$bar\033[K";
 }
@@ -139,8 +140,9 @@ sub _arguments {
         else { $given{$name} = $value }
     }
     for my $name (@{$command->{order}}) {
-        if ($parameters->{$name}{secret}) { local $/; $given{$name} = <STDIN> }
-        elsif ($parameters->{$name}{required} && !exists $given{$name}) { die "--$name is missing\n" }
+        my $parameter = $parameters->{$name};
+        if ($parameter->{secret}) { local $/; $given{$name} = <STDIN> }
+        die "--$name is missing\n" if $parameter->{required} && !exists $given{$name};
     }
     return %given;
 }
@@ -259,8 +261,8 @@ my $fits = qr/[\t\n\r -~]+|\xc2[\xa0-\xbf]|[\xc3-\xdf]$tail
 sub _show {
     my ($text) = @_;
     utf8::encode($text) if utf8::is_utf8($text);
-    $text =~ s/($fits)|(.)/defined $1 ? $1 : sprintf '\x%02x', ord $2/gse if $text =~ /[^\t\n\r -~]/;
-    return $text;
+    return $text if $text !~ /[^\t\n\r -~]/;
+    return $text =~ s/($fits)|(.)/defined $1 ? $1 : sprintf '\x%02x', ord $2/gser;
 }
 
 my %entity = ('&' => '&amp;', '<' => '&lt;', '>' => '&gt;', '"' => '&quot;', "\r" => '&#13;');
@@ -273,14 +275,15 @@ sub _element {
     my $head = $tag;
     $head .= " $_->[0]=\"" . _escape($_->[1]) . '"' for pairs @$attributes;
     return "<$head/>\n" if !@children;
-    return "<$head>" . _escape(join ' ', split ' ', ${$children[0]}) . "</$tag>\n" if ref $children[0];
+    return "<$head>" . _escape(${$children[0]} =~ s/\s*\n\s*/ /gr) . "</$tag>\n" if ref $children[0];
     return "<$head>\n" . join('', map { s/^/  /mgr } @children) . "</$tag>\n";
 }
 
 sub _descriptor {
     my ($command, $parameters) = @_;
     my $script = File::Spec->rel2abs($0);
-    die "'$script' is no name for a script: it needs quotes in a shell\n" if $script =~ m{[^\w./+,@-]};
+    die "'$script' is no name for a script: it needs quotes in a shell\n"
+        if $script =~ m{[^\w./+,@-]};
 
     my @parts = split /\./, $command->{path};
     my @namespaces = map {
@@ -297,6 +300,7 @@ sub _descriptor {
 
     my @open = grep { !$parameters->{$_}{secret} } @{$command->{order}};
     my $execute = join ' ', "PERL_BADLANG=0 $script", map { _form($_, $parameters->{$_}) } @open;
+    my @inputs = map { _parameter($_, $parameters->{$_}) } @{$command->{order}};
     my @stdin = map { my $form = "\$val{$_}"; _element('stdin', [], \$form) }
         grep { $parameters->{$_}{secret} } @{$command->{order}};
     return qq(<?xml version="1.0" encoding="UTF-8"?>\n) . _element('plugin', [],
@@ -305,7 +309,7 @@ sub _descriptor {
         _element('commands', [], _element('command', [path => $command->{path}],
             _element('description', [], \$command->{description}),
             @entries ? _element('meta-data', [], @entries) : (),
-            _element('input-spec', [], map { _parameter($_, $parameters->{$_}) } @{$command->{order}}),
+            _element('input-spec', [], @inputs),
             _element('output-spec', [], _sample($command->{result})),
             _element('format-parameters', [], _formats($command->{result})),
             _element('execute', [], \$execute),
@@ -356,7 +360,8 @@ sub _sample {
     return _element($type, []) if !ref $type;
     if ($type->{word} eq 'list') {
         my $item = $type->{item};
-        return _element('list', [type => ref $item ? $item->{word} : $item], ref $item ? _sample($item) : ());
+        return _element('list', [type => $item]) if !ref $item;
+        return _element('list', [type => $item->{word}], _sample($item));
     }
     return _element('structure', [typeName => $type->{name}],
         map { _element('field', [name => $_], _sample($type->{fields}{$_})) } @{$type->{order}});
@@ -369,11 +374,11 @@ sub _formats {
     my %seen;
     for my $structure (grep { !$seen{$_->{name}}++ } _structures($type)) {
         my $fields = join ',', @{$structure->{order}};
-        push @formats, _element('format-parameter', [name => "fields:$structure->{name}"], \$fields);
-        for my $field (grep { defined $structure->{units}{$_} } @{$structure->{order}}) {
-            push @formats, _element('format-parameter',
-                [name => "units:$structure->{name}.$field"], \$structure->{units}{$field});
-        }
+        my @keys = ("fields:$structure->{name}" => $fields);
+        push @keys, "units:$structure->{name}.$_" => $structure->{units}{$_}
+            for grep { defined $structure->{units}{$_} } @{$structure->{order}};
+        push @formats,
+            map { _element('format-parameter', [name => $_->[0]], \$_->[1]) } pairs @keys;
     }
     return @formats;
 }

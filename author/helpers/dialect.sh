@@ -85,11 +85,13 @@ dialect() {
             ;;
         *)
             _argument="ARGV[$_operand_count]"
-            _variables="$_variables $_name = substr($_argument, $((${#_name} + 2))); $_argument = \"\";"
+            _text="substr($_argument, $((${#_name} + 2)))"
+            _variables="$_variables $_name = $_text; $_argument = \"\";"
             ;;
         esac
     done
-    _document=$(LC_ALL=C awk "BEGIN { _lost = \"$_lost\";$_variables } $_dialect_functions$_program" "$@")
+    _program="BEGIN { _lost = \"$_lost\";$_variables } $_dialect_functions$_program"
+    _document=$(LC_ALL=C awk "$_program" "$@")
     _status=$?
     case $_status in
     0) ;;
@@ -156,7 +158,9 @@ function _number(place, value,    digits) {
     return "<int>" digits "</int>"
 }
 function _text(value)   { return "<string>" _escape(value) "</string>" }
-function _truth(value)  { return "<bool>" (value "" == "" || value "" == "0" ? "false" : "true") "</bool>" }
+function _truth(value)  {
+    return value "" == "" || value "" == "0" ? "<bool>false</bool>" : "<bool>true</bool>"
+}
 
 function _escape(value,    safe) {
     if (value !~ /[^ -~]|[&<>]/) return value

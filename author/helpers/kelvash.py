@@ -269,7 +269,8 @@ class _Option:
             for value, meaning in self.extra.values.items():
                 add(enum, "enum-value", meaning, value=str(value))
         elif self.kind is str:
-            add(add(element, "constraint", type="regex"), "regex", self.extra.pattern or self.safe())
+            pattern = self.extra.pattern or self.safe()
+            add(add(element, "constraint", type="regex"), "regex", pattern)
 
     def safe(self):
         """What may stand where the form of this parameter puts it."""

@@ -156,6 +156,14 @@ std::optional<DeclaredCommand> ReadCommand(const xmlNode* node, Report& report) 
         }
         return std::nullopt;
     }
+    try {
+        loaded.command->GetInputSpec();
+    } catch (const ZelmarException& error) {
+        // A parameter that is named like the help. The engine goes on without help from here.
+        if (!report.HasErrorIn(node)) {
+            report.AddError(node, "load", error.what());
+        }
+    }
     DeclaredCommand declared{node, loaded.command, {}};
     declared.parameters = ReadParameters(node, *declared.command, refused);
     return declared;

@@ -78,31 +78,46 @@ std::string Tag(const std::string& name) {
     return "<" + name + ">";
 }
 
-std::vector<std::string> AttributesOf(const std::string& element) {
-    static const std::map<std::string, std::vector<std::string>> attributes = {
-        {"namespace", {"path"}},
-        {"command", {"path"}},
-        {"meta-data-entry", {"name"}},
-        {"parameter", {"name", "type", "required", "secret", "shortname"}},
-        {"constraint", {"type"}},
-        {"enum-value", {"value"}},
-        {"range", {"min", "max"}},
-        {"structure", {"typeName"}},
-        {"field", {"name"}},
-        {"list", {"type"}},
-        {"format-parameter", {"name"}}};
-    const auto found = attributes.find(element);
-    return found == attributes.end() ? std::vector<std::string>() : found->second;
-}
+// What may stand in an element, for suggestions.
+struct ElementNames {
+    std::vector<std::string> attributes;
+    std::vector<std::string> children;
+    std::vector<std::string> requiredChildren;
+};
 
-std::vector<std::string> RequiredChildren(const std::string& element) {
-    static const std::map<std::string, std::vector<std::string>> children = {
-        {"plugin", {"version"}},
-        {"namespace", {"description"}},
-        {"command", {"input-spec", "output-spec", "format-parameters", "execute"}},
-        {"parameter", {"description"}}};
-    const auto found = children.find(element);
-    return found == children.end() ? std::vector<std::string>() : found->second;
+const ElementNames& NamesIn(const xmlNode* element) {
+    static const std::vector<std::string> values = {"int", "bool", "string", "structure", "list"};
+    static const std::map<std::string, ElementNames> names = {
+        {"plugin", {{}, {"version", "namespaces", "commands"}, {"version"}}},
+        {"namespaces", {{}, {"namespace"}, {}}},
+        {"namespace", {{"path"}, {"description"}, {"description"}}},
+        {"commands", {{}, {"command"}, {}}},
+        {"command",
+         {{"path"},
+          {"description", "meta-data", "input-spec", "output-spec", "format-parameters", "execute",
+           "stdin"},
+          {"input-spec", "output-spec", "format-parameters", "execute"}}},
+        {"meta-data", {{}, {"meta-data-entry"}, {}}},
+        {"meta-data-entry", {{"name"}, {}, {}}},
+        {"input-spec", {{}, {"parameter", "context-supported"}, {}}},
+        {"parameter",
+         {{"name", "type", "required", "secret", "shortname"},
+          {"description", "constraint"},
+          {"description"}}},
+        {"constraint", {{"type"}, {"enum", "regex", "range"}, {}}},
+        {"enum", {{}, {"enum-value"}, {"enum-value"}}},
+        {"enum-value", {{"value"}, {}, {}}},
+        {"range", {{"min", "max"}, {}, {}}},
+        {"output-spec", {{}, values, {}}},
+        {"structure", {{"typeName"}, {"field"}, {}}},
+        {"field", {{"name"}, values, {}}},
+        {"list", {{"type"}, {"structure"}, {}}},
+        {"format-parameters", {{}, {"formatter", "format-parameter"}, {}}},
+        {"format-parameter", {{"name"}, {}, {}}},
+    };
+    static const ElementNames none;
+    const auto found = names.find(NameOf(element));
+    return found == names.end() ? none : found->second;
 }
 
 // The rule behind a pattern of the schema.
@@ -118,33 +133,24 @@ std::string RuleFor(const std::string& attribute) {
     return found == rules.end() ? "another text" : found->second;
 }
 
-bool StandsTwice(const xmlNode* node) {
-    for (const xmlNode* before = node->prev; before; before = before->prev) {
-        if (IsElement(before, NameOf(node).c_str())) {
-            return true;
-        }
-    }
-    return false;
-}
-
 void RemoveNode(xmlNode* node) {
     xmlUnlinkNode(node);
     xmlFreeNode(node);
 }
 
-// "This element is not expected. Expected is one of ( a, b )."
+// "This element is not expected."
 void MendElement(const Fault& fault, Report& report) {
     const std::string name = NameOf(fault.node);
     const std::string parent = NameOf(fault.node->parent);
-    const std::string list = Between(fault.text, "Expected is", " ).");
-    const auto expected = Split(list.substr(std::min(list.find("( ") + 2, list.size())), ", ");
-    const std::string nearest = StandsTwice(fault.node) ? "" : Nearest(name, expected);
+    const auto& expected = NamesIn(fault.node->parent).children;
+    const bool isTooMany = std::ranges::find(expected, name) != expected.end();
+    const std::string nearest = isTooMany ? "" : Nearest(name, expected);
     std::string text;
     if (!nearest.empty()) {
         text = "there is no element " + Tag(name) + " in " + Tag(parent) + "; did you mean " +
                Tag(nearest) + "?";
-    } else if (StandsTwice(fault.node)) {
-        text = "one " + Tag(name) + " too many in " + Tag(parent) + "; leave one";
+    } else if (isTooMany) {
+        text = "one " + Tag(name) + " too many in " + Tag(parent) + "; leave it out";
     } else {
         text =
             Tag(name) + " has no place in " + Tag(parent) +
@@ -162,7 +168,7 @@ void MendElement(const Fault& fault, Report& report) {
 void MendAttribute(const Fault& fault, Report& report) {
     const std::string element = NameOf(fault.node);
     const std::string name = Between(fault.text, "attribute '", "'");
-    const auto names = AttributesOf(element);
+    const auto& names = NamesIn(fault.node).attributes;
     const std::string nearest = Nearest(name, names);
     const std::string value = Attribute(fault.node, name.c_str());
     report.AddError(fault.node, "schema",
@@ -188,7 +194,7 @@ std::string WordFault(const std::string& place, const Fault& fault) {
 
 std::string MissingChildren(const xmlNode* node) {
     std::vector<std::string> missing;
-    for (const std::string& name : RequiredChildren(NameOf(node))) {
+    for (const std::string& name : NamesIn(node).requiredChildren) {
         if (!Child(node, name.c_str())) {
             missing.push_back(Tag(name));
         }
@@ -230,8 +236,8 @@ bool IsStrayElement(const Fault& fault) {
            fault.text.find("This element is not expected") != std::string::npos;
 }
 
-bool IsStrayAttribute(const Fault& fault) {
-    return fault.code == XML_SCHEMAV_CVC_COMPLEX_TYPE_3_2_1;
+bool IsStray(const Fault& fault) {
+    return IsStrayElement(fault) || fault.code == XML_SCHEMAV_CVC_COMPLEX_TYPE_3_2_1;
 }
 
 }  // namespace
@@ -239,16 +245,16 @@ bool IsStrayAttribute(const Fault& fault) {
 void CheckSchema(xmlDoc* document, Report& report) {
     std::vector<Fault> faults = Validate(document);
     for (int mends = 0; mends < mostMends; ++mends, faults = Validate(document)) {
-        const auto stray = std::ranges::find_if(faults, [](const Fault& fault) {
-            return IsStrayElement(fault) || IsStrayAttribute(fault);
-        });
+        const auto stray = std::ranges::find_if(faults, IsStray);
         if (stray == faults.end()) {
             break;
         }
         IsStrayElement(*stray) ? MendElement(*stray, report) : MendAttribute(*stray, report);
     }
     for (const Fault& fault : faults) {
-        report.AddError(fault.node, "schema", TextFor(fault));
+        if (!IsStray(fault)) {
+            report.AddError(fault.node, "schema", TextFor(fault));
+        }
     }
 }
 

@@ -4,6 +4,8 @@
 #include <author/lint/Simulation.h>
 
 #include <algorithm>
+#include <charconv>
+#include <utility>
 
 namespace Author {
 
@@ -25,28 +27,34 @@ Treatment TreatmentOf(std::string_view left) {
                            : Treatment::Escaped;
 }
 
+// The number in a mark that begins at `begin`, behind its first word; `end` moves behind the mark.
+size_t ReadMark(std::string_view text, size_t begin, size_t& end) {
+    size_t number = 0;
+    const char* first = text.data() + begin + markBegin.size();
+    end = static_cast<size_t>(std::from_chars(first, text.data() + text.size(), number).ptr -
+                              text.data() + 1);
+    return number;
+}
+
 // Takes the probes out of the text.
 void ReadProbes(const DeclaredCommand& command, Expansion& expansion) {
-    std::string& text = expansion.text;
-    for (size_t i = 0; i < command.parameters.size(); ++i) {
-        for (const char value : {'a', 'b'}) {
-            const std::string mark = MarkOf(i, value);
-            for (size_t at = text.find(mark); at != std::string::npos;
-                 at = text.find(mark, at + 1)) {
-                const size_t begin = at + mark.size();
-                const size_t end = text.find(markEnd, begin);
-                if (end == std::string::npos) {
-                    break;
-                }
-                expansion.occurrences.push_back(
-                    {&command.parameters[i], at, TreatmentOf(text.substr(begin, end - begin))});
-                text.erase(begin, end - begin);
-                for (Occurrence& other : expansion.occurrences) {
-                    other.place -= other.place > at ? end - begin : 0;
-                }
-            }
+    const std::string text = std::exchange(expansion.text, "");
+    size_t done = 0;
+    for (size_t begin = text.find(markBegin); begin != std::string::npos;
+         begin = text.find(markBegin, done)) {
+        size_t left = 0;
+        const size_t number = ReadMark(text, begin, left);
+        const size_t end = text.find(markEnd, left);
+        if (number >= command.parameters.size() || end == std::string::npos) {
+            break;  // the template has the mark itself
         }
+        expansion.text.append(text, done, begin - done);
+        expansion.occurrences.push_back({&command.parameters[number], expansion.text.size(),
+                                         TreatmentOf(text.substr(left, end - left))});
+        expansion.text.append(text, begin, left - begin);
+        done = end;
     }
+    expansion.text.append(text, done);
 }
 
 void Give(const DeclaredCommand& command, size_t index, CallSpec::Input& input, Given& expected) {
@@ -123,18 +131,21 @@ std::vector<Expansion> Simulate(const DeclaredCommand& command, const Template& 
 }
 
 std::string Readable(const std::string& text, const DeclaredCommand& command) {
-    std::string readable = text;
-    for (size_t i = 0; i < command.parameters.size(); ++i) {
-        for (const char value : {'a', 'b'}) {
-            const std::string mark = MarkOf(i, value) + std::string(markEnd);
-            for (size_t at = readable.find(mark); at != std::string::npos;
-                 at = readable.find(mark, at)) {
-                readable.replace(at, mark.size(),
-                                 "<" + command.parameters[i].spec->GetName() + ">");
-            }
+    std::string readable;
+    size_t done = 0;
+    for (size_t begin = text.find(markBegin); begin != std::string::npos;
+         begin = text.find(markBegin, done)) {
+        size_t end = 0;
+        const size_t number = ReadMark(text, begin, end);
+        if (number >= command.parameters.size() ||
+            text.compare(end, markEnd.size(), markEnd) != 0) {
+            break;
         }
+        readable.append(text, done, begin - done);
+        readable += "<" + command.parameters[number].spec->GetName() + ">";
+        done = end + markEnd.size();
     }
-    return readable;
+    return readable.append(text, done);
 }
 
 }  // namespace Author

@@ -116,6 +116,8 @@ TEST(InputSpec, ComplainsOfWhatIsGivenAndThenOfWhatIsMissing) {
               Texts({"Invalid data 'x' for parameter alpha expected type Integer",
                      "Unknown parameter : b", "Unknown parameter : zeta",
                      "Missing required parameter --help", "Missing required parameter --mid"}));
+    EXPECT_EQ(Complaints(*InputSpec::New(), Give({{"zeta", "1"}})),
+              Texts({"Unknown parameter : zeta"}));
     EXPECT_EQ(Complaints(*spec, Give({{"help", "x"}, {"zeta", "1"}, {"alpha", "x"}})), Texts());
 }
 

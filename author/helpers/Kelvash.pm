@@ -89,8 +89,7 @@ sub run {
     my $failed = !defined $text;
     if ($failed) {
         progress(1, 1);
-        $text = join '', map { 'ERROR:' . _show($_) . "\n" }
-            ref $@ eq 'ARRAY' ? @{$@} : join ' ', split /\n/, $@;
+        $text = join '', map { 'ERROR:' . _show($_) . "\n" } grep { length } split /\n/, $@;
         $result = \*STDERR if $describe;
     }
     binmode $result;
@@ -176,7 +175,7 @@ sub _document {
     my ($type, $value) = @_;
     my (@out, @faults);
     _print('result', $type, $value, \@out, \@faults);
-    die [@faults > 10 ? @faults[0 .. 9] : @faults] if @faults;
+    die map { "$_\n" } grep { defined } @faults[0 .. 9] if @faults;
     return join '', "<output>\n", @out, "\n</output>\n";
 }
 
@@ -247,6 +246,7 @@ sub _short {
     my ($value) = @_;
     return 'nothing' if !defined $value;
     return ref $value if ref $value;
+    $value =~ s/\n/ /g;
     return length $value <= 60 ? "'$value'" : "'" . substr($value, 0, 57) . "'...";
 }
 

@@ -4,8 +4,8 @@
 #
 # and then has:
 #
-#     fail TEXT                   tell what is wrong as an ERROR: line and end the script;
-#                                 such a line counts only at the very start of the output
+#     fail TEXT                   tell what is wrong, each line of it as an ERROR: line, and end
+#                                 the script; such lines count only at the very start of the output
 #     rows COMMAND ARGUMENT...    run a command whose rows go into a pipe; when it fails, the
 #                                 dialect at the end of the pipe tells it in place of a result
 #     read_files FILE...          each line of the files as "FILE<tab>LINE", in one process;
@@ -47,7 +47,10 @@ _lost="[$$: lost] " # what no input holds by chance
 
 fail() {
     _clear_bar
-    printf 'ERROR:%s\n' "$*"
+    _text=$*
+    IFS=$_line_feed
+    set -f
+    printf 'ERROR:%s\n' $_text
     exit 1
 }
 

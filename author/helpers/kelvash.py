@@ -111,12 +111,13 @@ def _errors(fault):
         raise fault
     progress(1, 1)
     if isinstance(fault, Failure):
-        lines = fault.args or ["It failed"]
+        text = "\n".join(map(str, fault.args))
     elif isinstance(fault, SystemExit):
-        lines = [fault.code]
+        text = fault.code
     else:
-        lines = [f"{_place(fault)}: {type(fault).__name__}: {fault}"]
-    return "".join(f"ERROR:{_show(' '.join(str(line).splitlines()))}\n" for line in lines)
+        text = f"{_place(fault)}: {type(fault).__name__}: {fault}"
+    lines = [line for line in text.splitlines() if line] or ["It failed"]
+    return "".join(f"ERROR:{_show(line)}\n" for line in lines)
 
 
 def _place(fault):

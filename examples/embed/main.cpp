@@ -1,12 +1,13 @@
-// A program with commands of its own that never sees a command line: it addresses them by path,
-// passes their parameters as strings, reads their values, and formats them when a person is to
-// see them.
+// A program with commands of its own that needs no command line: it addresses them by path, passes
+// their parameters as strings, reads their values, and formats them when a person is to see them.
+// With words behind its name it is a tool as well.
 
 #include "RoomList.h"
 
 #include <iostream>
 #include <sstream>
 
+using AutoCli::CliDispatcher;
 using AutoCli::CommandInput;
 using AutoCli::CommandOutput;
 using AutoCli::Dispatcher;
@@ -59,13 +60,26 @@ void Run(Dispatcher& dispatcher, const std::shared_ptr<CommandInput>& input) {
               << Format(dispatcher, input, output);
 }
 
+int RunAsTool(CliDispatcher& dispatcher, int argc, char** argv) {
+    try {
+        dispatcher.HandleArgvInput(argc, argv);
+    } catch (const std::exception& error) {
+        std::cerr << "Errors: \n" << error.what() << std::endl;
+        return EXIT_FAILURE;
+    }
+}
+
 }  // namespace
 
-int main() {
+int main(int argc, char** argv) {
     const std::vector<Room> rooms = {{"cellar", 11}, {"kitchen", 21}, {"bathroom", 24}};
-    Dispatcher dispatcher;
+    CliDispatcher dispatcher;
     dispatcher.GetRootNamespace()->SubNamespace("room")->RegisterNamespaceNode(RoomList::New(rooms),
                                                                                "list");
+    AutoCli::AutoCli_AnswerCompletion(dispatcher);
+    if (argc > 1) {
+        return RunAsTool(dispatcher, argc, argv);
+    }
 
     Run(dispatcher, Call({"room", "list"}));
 

@@ -93,14 +93,15 @@ dialect() {
             ;;
         esac
     done
+    # Without a pipe there are no rows to lose, and a program of BEGIN alone reads no input.
+    [ ! -p /dev/stdin ] || _program="$_rows_are_lost$_program"
     _program="BEGIN { _lost = \"$_lost\";$_variables } $_dialect_functions$_program"
     _document=$(LC_ALL=C awk "$_program" "$@")
     _status=$?
-    case $_status in
-    0) ;;
-    3) fail "${_document##*"$_line_feed"}" ;;
-    *) fail "awk ended with status $_status" ;;
+    case $_document in
+    *"$_lost"*) _text=${_document#*"$_lost"}; fail "${_text%%"$_line_feed"*}" ;;
     esac
+    [ $_status -eq 0 ] || fail "awk ended with status $_status"
     printf %s "${_document:+$_document$_line_feed}"
 }
 
@@ -118,11 +119,12 @@ _clear_bar() {
     _bar_is_drawn=''
 }
 
-# An exit runs the END rules, and this one is the first of them.
+_rows_are_lost='index($0, _lost) { fail(substr($0, index($0, _lost) + length(_lost))) }
+'
+
+# An exit still runs the END rules, so the first such text is not the last that is printed.
 _dialect_functions='
-function fail(text) { gsub(/[^ -~\200-\377]/, " ", text); print text; exit _failed = 3 }
-END { if (_failed) exit 3 }
-index($0, _lost) { fail(substr($0, index($0, _lost) + length(_lost))) }
+function fail(text) { gsub(/[^ -~\200-\377]/, " ", text); print _lost text; exit 1 }
 
 function open_list(kind)      { _open("list", " type=\"" kind "\"") }
 function open_structure(type) { _open("structure", " typeName=\"" type "\"") }

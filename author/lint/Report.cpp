@@ -13,11 +13,11 @@ constexpr std::string_view blanks = " \t\n\r";
 
 // In the order of the documentation.
 const std::vector<std::string> ruleNames = {
-    "xml",      "doctype", "schema", "load",    "content", "path",    "parent", "twice",
-    "name",     "range",   "regex",  "blanks",  "type",    "slow",    "form",   "spell",
-    "unquoted", "quotes",  "active", "removed", "visible", "order",   "left",   "lines",
-    "syntax",   "unknown", "kind",   "unread",  "bool",    "program", "secret", "formatter",
-    "key",      "field",   "printf", "heading", "allow"};
+    "xml",     "doctype", "schema",  "load",    "content", "parent", "twice",     "name",
+    "range",   "regex",   "blanks",  "type",    "slow",    "form",   "spell",     "unquoted",
+    "quotes",  "active",  "removed", "visible", "order",   "left",   "lines",     "syntax",
+    "unknown", "kind",    "unread",  "bool",    "program", "secret", "formatter", "key",
+    "field",   "printf",  "heading", "allow"};
 
 std::string_view Trim(std::string_view text) {
     const size_t begin = std::min(text.find_first_not_of(blanks), text.size());

@@ -1,5 +1,6 @@
 // The dialect that extension commands print.
 
+#include <tests/support/Schema.h>
 #include <tests/support/Split.h>
 #include <zelmar/ZelmarException.h>
 #include <zelmar/autocli/extension/StreamInt.h>
@@ -103,10 +104,22 @@ TEST_F(XmlOutput, ReadsValues) {
         {"<list/>",
          "! Invalid list type attribute.  Must be one of [string, int, bool, structure, list]"},
     };
+    // What the schema takes is read, but for what it cannot say.
+    const Schema schema("output.xsd");
+    std::string beyondSchema;
     for (const Case& test : cases) {
-        EXPECT_EQ(Read("<anything>" + std::string(test.below) + "</anything>"), test.value)
-            << test.below;
+        const std::string text = "<output>" + std::string(test.below) + "</output>";
+        EXPECT_EQ(Read(text), test.value) << test.below;
+        if (std::string_view(test.value).starts_with("!") && schema.IsValid(text)) {
+            beyondSchema += "\n" + std::string(test.below);
+        }
     }
+    EXPECT_EQ(beyondSchema, R"(
+<int>5<!-- c --></int>
+<list type="string"><int>1</int></list>
+<list type="structure"><int>1</int></list>
+<list type="structure"><structure typeName="A"/><structure typeName="A"><field name="a">
+            <int/></field></structure></list>)");
 }
 
 TEST_F(XmlOutput, TakesWhatIsNoDocumentForNothing) {

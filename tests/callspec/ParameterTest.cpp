@@ -150,12 +150,13 @@ TEST(Parameter, JudgesAllValuesAndNamesAllFaults) {
          "Invalid data 'x' for parameter p.  This parameter is a flag and cannot accept any"
          " values. \n"},
     };
-    for (const auto& [type, values, complaints, constraint] : cases) {
-        const auto parameter = ParameterSpec::New("p", type);
-        parameter->SetConstraint(constraint);
-        EXPECT_EQ(
-            Complaints([&](const auto& output) { return parameter->Validate(values, output); }),
-            complaints);
+    for (const auto& row : cases) {
+        const auto parameter = ParameterSpec::New("p", row.type);
+        parameter->SetConstraint(row.constraint);
+        const auto judge = [&](const auto& output) {
+            return parameter->Validate(row.values, output);
+        };
+        EXPECT_EQ(Complaints(judge), row.complaints);
     }
 }
 

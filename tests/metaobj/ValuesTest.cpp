@@ -190,20 +190,23 @@ constexpr int levels = 100000;
 
 // A struct in the declaration of a list, in a list, in a struct; and definitions of definitions.
 TEST(DeepValues, DieLevelByLevel) {
-    auto value = MetaStruct::New("Level");
+    auto item = MetaStruct::New("Level");
+    auto declared = MetaStruct::New("Level");
     auto defined = MetaStruct::New("Level");
-    const std::weak_ptr<MetaStruct> innermost = value;
-    const std::weak_ptr<MetaStruct> firstDefinition = defined;
+    const std::vector<std::weak_ptr<MetaStruct>> innermost = {item, declared, defined};
+    const auto anyList = MetaList::New(MetaType::Struct, Struct());
+    item->SetField("in", anyList);
     for (int level = 0; level < levels; ++level) {
-        auto lists = std::make_shared<MetaList>(MetaType::List, nullptr, MetaObject::FactoryFlag());
-        lists->Add(MetaList::New(MetaType::Struct, value));
-        value = MetaStruct::New("Level");
-        value->SetField("in", lists);
+        auto list = MetaList::New(MetaType::Struct, Make("Level", {{"in", anyList}}));
+        list->Add(item);
+        item = Make("Level", {{"in", list}});
+        declared = Make("Level", {{"in", MetaList::New(MetaType::Struct, declared)}});
         defined = MetaStruct::New(defined);
     }
-    value.reset();
+    item.reset();
+    declared.reset();
     defined.reset();
-    EXPECT_TRUE(innermost.expired() && firstDefinition.expired());
+    EXPECT_TRUE(std::ranges::all_of(innermost, &std::weak_ptr<MetaStruct>::expired));
 }
 
 Struct NestedAround(std::shared_ptr<MetaObject> value) {

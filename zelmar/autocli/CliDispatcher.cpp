@@ -298,7 +298,10 @@ void CliDispatcher::PrintOutput(const std::shared_ptr<CommandInput>& input,
         format = GetHelpFormatParams();
     }
     format.OverrideValues(overrides);
-    FormatOutput(output, format, context, std::cout);
+    // Formatters change the flags of their stream; those of std::cout belong to all threads.
+    std::ostream stream(std::cout.rdbuf());
+    FormatOutput(output, format, context, stream);
+    std::cout.setstate(stream.rdstate());
 }
 
 bool CliDispatcher::HandleDispatcherOptions(OptionParser& parser, FormatParameters& overrides,
@@ -393,8 +396,8 @@ void CliDispatcher::PrintChildren(std::shared_ptr<NamespaceNode> node,
     FormatParameters parameters = GetHelpFormatParams();
     DisplayContext context;
     GetDisplayContext(context);
-    const BlockOutput blocks(std::cout);
-    CliDispatcherHelpFormatter().Format(output, parameters, context, std::cout);
+    BlockOutput blocks(std::cout);
+    CliDispatcherHelpFormatter().Format(output, parameters, context, blocks);
 }
 
 void CliDispatcher::PrintError(const std::shared_ptr<Output>& output) {

@@ -76,8 +76,9 @@ bool Dispatcher::FormatOutput(const std::shared_ptr<CallSpec::Output>& output,
     if (!RequireFormatter(name, *output)) {
         return false;
     }
-    const BlockOutput blocks(stream);
-    GetFormatter(name)->Format(output, parameters, context, stream);
+    BlockOutput blocks(stream);
+    GetFormatter(name)->Format(output, parameters, context, blocks);
+    stream.flags(blocks.flags());
     return true;
 }
 

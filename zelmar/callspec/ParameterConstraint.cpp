@@ -36,6 +36,50 @@ std::string Violation(const std::string& parameterName) {
     return "Invalid data constraint for parameter '" + parameterName + "'. ";
 }
 
+// Each of these gives the reason to refuse a value, or nothing.
+
+std::string RefuseInt(const ParameterConstraint& constraint, const std::string& value,
+                      const std::string& parameterName) {
+    long number = 0;
+    if (!ParameterSpec::GetInt(value, number)) {
+        return "Invalid data type for parameter '" + parameterName + "'. Expected an Integer";
+    }
+    if (constraint.GetType() == ConstraintTypeIntEnum) {
+        return Contains(constraint.GetIntEnum(), number)
+                   ? ""
+                   : Violation(parameterName) + "Expected a single value from the set " +
+                         constraint.ToString();
+    }
+    long min = 0;
+    long max = 0;
+    constraint.GetIntRange(min, max);
+    return min <= number && number <= max
+               ? ""
+               : Violation(parameterName) + "Expected " + constraint.ToString();
+}
+
+std::string RefuseString(const ParameterConstraint& constraint, const std::string& value,
+                         const std::string& parameterName) {
+    return Contains(constraint.GetStringEnum(), value)
+               ? ""
+               : Violation(parameterName) + "Expected a single value from the set " +
+                     constraint.ToString() + " got '" + value + "'";
+}
+
+std::string RefuseMismatch(const std::string& regex, const std::string& value,
+                           const std::string& parameterName) {
+    try {
+        return boost::regex_match(value, boost::regex(regex))
+                   ? ""
+                   : Violation(parameterName) +
+                         "Value does not match the expected regular expression (" + regex + ")";
+    } catch (const std::runtime_error& error) {
+        // The expression is broken, or the matcher gave up before it took exponential time.
+        return Violation(parameterName) + "Unable to apply the regular expression (" + regex +
+               "): " + error.what();
+    }
+}
+
 }  // namespace
 
 std::shared_ptr<ParameterConstraint> ParameterConstraint::New(ParameterConstraintType type) {
@@ -96,71 +140,27 @@ std::string ParameterConstraint::ToString() const {
 
 bool ParameterConstraint::Validate(const std::string& value, const std::string& parameterName,
                                    const std::shared_ptr<Output>& output) const {
+    std::string refusal;
     switch (_type) {
         case ConstraintTypeNone:
             return true;
         case ConstraintTypeIntRange:
         case ConstraintTypeIntEnum:
-            return ValidateInt(value, parameterName, *output);
+            refusal = RefuseInt(*this, value, parameterName);
+            break;
         case ConstraintTypeStringEnum:
-            return ValidateStringEnum(value, parameterName, *output);
+            refusal = RefuseString(*this, value, parameterName);
+            break;
         case ConstraintTypeStringRegex:
-            return ValidateRegex(value, parameterName, *output);
+            refusal = RefuseMismatch(_regex, value, parameterName);
+            break;
+        default:
+            return false;
     }
-    return false;
-}
-
-bool ParameterConstraint::AcceptsInt(long value) const {
-    return _type == ConstraintTypeIntRange ? _min <= value && value <= _max
-                                           : Contains(_intEnum, value);
-}
-
-bool ParameterConstraint::ValidateInt(const std::string& value, const std::string& parameterName,
-                                      Output& output) const {
-    long number = 0;
-    if (!ParameterSpec::GetInt(value, number)) {
-        output.AddErrorMessage("Invalid data type for parameter '" + parameterName +
-                               "'. Expected an Integer");
-        return false;
+    if (!refusal.empty()) {
+        output->AddErrorMessage(refusal);
     }
-    if (!AcceptsInt(number)) {
-        output.AddErrorMessage(Violation(parameterName) +
-                               (_type == ConstraintTypeIntRange
-                                    ? "Expected "
-                                    : "Expected a single value from the set ") +
-                               ToString());
-        return false;
-    }
-    return true;
-}
-
-bool ParameterConstraint::ValidateStringEnum(const std::string& value,
-                                             const std::string& parameterName,
-                                             Output& output) const {
-    if (Contains(_stringEnum, value)) {
-        return true;
-    }
-    output.AddErrorMessage(Violation(parameterName) + "Expected a single value from the set " +
-                           ToString() + " got '" + value + "'");
-    return false;
-}
-
-bool ParameterConstraint::ValidateRegex(const std::string& value, const std::string& parameterName,
-                                        Output& output) const {
-    try {
-        if (boost::regex_match(value, boost::regex(_regex))) {
-            return true;
-        }
-        output.AddErrorMessage(Violation(parameterName) +
-                               "Value does not match the expected regular expression (" + _regex +
-                               ")");
-    } catch (const std::runtime_error& error) {
-        // The expression is broken, or the matcher gave up before it took exponential time.
-        output.AddErrorMessage(Violation(parameterName) +
-                               "Unable to apply the regular expression (" + _regex +
-                               "): " + error.what());
-    }
-    return false;
+    return refusal.empty();
 }
 
 }  // namespace CallSpec

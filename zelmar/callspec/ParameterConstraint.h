@@ -20,7 +20,8 @@ enum ParameterConstraintType : int {
 };
 
 /// A rule on each value of a parameter. The kind decides which of the data below it reads; data of
-/// another kind may be stored and is never looked at.
+/// another kind may be stored and is never looked at. Once it is filled, several threads may judge
+/// by it.
 class ZELMAR_EXPORT ParameterConstraint {
 public:
     explicit ParameterConstraint(ParameterConstraintType type) : _type(type) {}
@@ -64,14 +65,6 @@ public:
                   const std::shared_ptr<Output>& output) const;
 
 private:
-    [[nodiscard]] bool AcceptsInt(long value) const;
-    bool ValidateInt(const std::string& value, const std::string& parameterName,
-                     Output& output) const;
-    bool ValidateStringEnum(const std::string& value, const std::string& parameterName,
-                            Output& output) const;
-    bool ValidateRegex(const std::string& value, const std::string& parameterName,
-                       Output& output) const;
-
     const ParameterConstraintType _type;
     long _min = 0;
     long _max = 0;

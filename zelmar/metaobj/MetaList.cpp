@@ -1,6 +1,7 @@
 #include <zelmar/ZelmarException.h>
 #include <zelmar/metaobj/MetaList.h>
 #include <zelmar/metaobj/MetaScalars.h>
+#include <zelmar/metaobj/Nested.h>
 
 #include <boost/algorithm/string/join.hpp>
 
@@ -27,8 +28,17 @@ void AddEach(MetaList& list, const Values& values) {
 
 }  // namespace
 
+MetaList::MetaList(MetaType type, FactoryFlag flag) : MetaObject(kind, flag), _listType(type) {
+    if (type == MetaType::Struct || type == MetaType::List) {
+        throw ZelmarException("Integer, boolean or string type expected for list.");
+    }
+}
+
 MetaList::MetaList(MetaType type, std::shared_ptr<MetaStruct> structure, FactoryFlag flag)
     : MetaObject(kind, flag), _listStructure(std::move(structure)), _listType(type) {
+    if (type != MetaType::Struct) {
+        throw ZelmarException("Struct type expected for list.");
+    }
     if (_listStructure) {
         _listStructure->LockStructure();
     }
@@ -36,16 +46,13 @@ MetaList::MetaList(MetaType type, std::shared_ptr<MetaStruct> structure, Factory
 
 MetaList::~MetaList() {
     for (auto& object : _objects) {
-        Release(std::move(object));
+        MetaStruct::Release(std::move(object));
     }
-    Release(std::move(_listStructure));
+    MetaStruct::Release(std::move(_listStructure));
 }
 
 std::shared_ptr<MetaList> MetaList::New(MetaType type) {
-    if (type == MetaType::Struct || type == MetaType::List) {
-        throw ZelmarException("Integer, boolean or string type expected for list.");
-    }
-    return std::make_shared<MetaList>(type, nullptr, FactoryFlag());
+    return std::make_shared<MetaList>(type, FactoryFlag());
 }
 
 std::shared_ptr<MetaList> MetaList::New(MetaType type,
@@ -54,9 +61,6 @@ std::shared_ptr<MetaList> MetaList::New(MetaType type,
 }
 
 std::shared_ptr<MetaList> MetaList::New(MetaType type, std::shared_ptr<MetaStruct>&& structure) {
-    if (type != MetaType::Struct) {
-        throw ZelmarException("Struct type expected for list.");
-    }
     return std::make_shared<MetaList>(type, std::move(structure), FactoryFlag());
 }
 

@@ -16,6 +16,7 @@ class ZELMAR_EXPORT MetaList final : public MetaObject {
 public:
     static constexpr MetaType kind = MetaType::List;
 
+    MetaList(MetaType type, FactoryFlag flag);
     MetaList(MetaType type, std::shared_ptr<MetaStruct> structure, FactoryFlag flag);
     ~MetaList();
 

@@ -14,7 +14,8 @@ const std::string& MetaTypeString(const MetaType& type) {
 
 bool MetaObject::IsSameStructure(const std::shared_ptr<MetaObject>& other,
                                  std::vector<std::string>* errors) const {
-    const bool isScalar = _type != MetaType::Struct && _type != MetaType::List;
+    const bool isScalar =
+        _type == MetaType::Int || _type == MetaType::Bool || _type == MetaType::String;
     if (other && isScalar && other->_type == _type) {
         return true;
     }

@@ -19,7 +19,8 @@ ZELMAR_EXPORT const std::string& MetaTypeString(const MetaType& type);
 
 /// A self-describing value: what commands return and how they declare the shape of what they
 /// return. Values are made by the static `New` of the concrete classes and held by shared pointers.
-/// A finished value may be read from any thread. Only memory bounds how deep values are nested.
+/// A value that no longer changes may be read, shared and let go of in any number of threads; while
+/// it is built it belongs to one. Only memory bounds how deep values are nested.
 class ZELMAR_EXPORT MetaObject {
 public:
     /// Marks the constructors that only the `New` factories mean to call.
@@ -32,7 +33,8 @@ public:
 
     /// Has `other` the shape of this value? This value is what is expected, `other` is under test.
     /// Reasons are appended to `errors` unless that is null; a null `other` answers false. For the
-    /// scalars the kind is the whole shape: 5 has the same structure as 7.
+    /// scalars the kind is the whole shape: 5 has the same structure as 7. A kind outside the five
+    /// has the shape of nothing, unless its class says otherwise.
     virtual bool IsSameStructure(const std::shared_ptr<MetaObject>& other,
                                  std::vector<std::string>* errors) const;
 
@@ -44,18 +46,6 @@ protected:
 
     // Not virtual: a value dies through the shared pointer that its factory made.
     ~MetaObject() = default;
-
-    // For structs and lists, which may be nested deeper than the stack of a thread reaches: these
-    // need none of it for a level.
-
-    // What `IsSameStructure` of `expected` answers.
-    static bool CompareStructure(const MetaObject& expected,
-                                 const std::shared_ptr<MetaObject>& other,
-                                 std::vector<std::string>* errors);
-    // What `ToString` of the value gives.
-    static std::string NestedText(const MetaObject& value);
-    // Lets go of a value within another one that dies; what dies in turn waits until it has died.
-    static void Release(std::shared_ptr<MetaObject>&& value);
 
 private:
     const MetaType _type;

@@ -3,6 +3,7 @@
 #include <zelmar/metaobj/MetaList.h>
 #include <zelmar/metaobj/MetaScalars.h>
 #include <zelmar/metaobj/MetaStruct.h>
+#include <zelmar/metaobj/Nested.h>
 
 using Zelmar::ZelmarException;
 
@@ -47,6 +48,46 @@ MetaStruct::~MetaStruct() {
         Release(std::move(field.value));
     }
     Release(std::move(_structureDefinition));
+}
+
+namespace {
+
+// Values that are going at present, one within the other.
+struct Dying {
+    int depth = 1;
+    std::shared_ptr<MetaStruct> waiting;  // the first of those that wait for their turn
+};
+
+thread_local Dying* dying = nullptr;  // null where none is
+
+}  // namespace
+
+// At an ordinary depth a value goes within the destructor of the one around it. Those further in
+// wait, each linked to the next, until the stack of the thread is free of the ones around them.
+// Structs alone need to: what a list holds are scalars and structs.
+void MetaStruct::Release(std::shared_ptr<MetaObject>&& value) {
+    constexpr int ordinaryDepth = 8;
+    if (!value || (value->GetType() != MetaType::Struct && value->GetType() != MetaType::List)) {
+        return;
+    }
+    if (!dying) {
+        Dying outermost;
+        dying = &outermost;
+        value.reset();
+        while (const auto next = std::move(outermost.waiting)) {
+            outermost.waiting = std::move(next->_waitsBehind);
+        }
+        dying = nullptr;
+    } else if (dying->depth >= ordinaryDepth && value.use_count() == 1 &&
+               MetaCast<MetaStruct>(value.get())) {
+        auto last = std::static_pointer_cast<MetaStruct>(std::move(value));
+        last->_waitsBehind = std::move(dying->waiting);
+        dying->waiting = std::move(last);
+    } else {
+        ++dying->depth;
+        value.reset();
+        --dying->depth;
+    }
 }
 
 std::shared_ptr<MetaStruct> MetaStruct::New(const std::string& typeName) {

@@ -124,6 +124,12 @@ public:
     [[nodiscard]] std::string ToString() const override;
 
 private:
+    friend class MetaList;
+
+    // Lets go of a value within another one that dies, without any memory, and with little of the
+    // stack however deep values are nested.
+    static void Release(std::shared_ptr<MetaObject>&& value);
+
     using Fields = std::map<std::string, Field>;
 
     void Store(const std::string& name, std::shared_ptr<MetaObject> value,
@@ -134,6 +140,7 @@ private:
     std::shared_ptr<MetaStruct> _structureDefinition;
     std::string _typeName;
     bool _locked = false;
+    std::shared_ptr<MetaStruct> _waitsBehind;  // used while values die
 };
 
 }  // namespace MetaObj

@@ -1,12 +1,8 @@
-// What goes through values within values. They may be nested deeper than the stack of a thread
-// reaches, so each of these keeps what it still has to do on a stack of its own.
-
-#include <zelmar/metaobj/MetaList.h>
+#include <zelmar/metaobj/Nested.h>
+#include <zelmar/metaobj/ValueWalk.h>
 
 #include <array>
 #include <memory_resource>
-#include <string_view>
-#include <variant>
 
 namespace MetaObj {
 
@@ -19,22 +15,25 @@ public:
     }
 
     bool Compare(const MetaObject& expected, const std::shared_ptr<MetaObject>& other) {
+        // Of the part that was looked at last, within the innermost pair that is still open.
         bool same = Enter(expected, other);
-        while (same && !_open.empty()) {
-            same = Continue();
-        }
-        for (; !_open.empty(); _open.pop_back()) {  // what lies around a difference differs too
-            Refuse(ComplaintAbout(_open.back()));
+        while (!_open.empty()) {
+            if (same) {
+                same = LookOn();
+            } else {  // what lies around a difference differs too
+                Refuse(ComplaintAbout(_open.back()));
+                _open.pop_back();
+            }
         }
         return same;
     }
 
 private:
-    struct Open {
-        const MetaStruct* expected;  // null for a list, of which only the declaration is compared
+    // Two structs, or two lists, of which only the declared structures are compared.
+    struct Pair {
+        const MetaStruct* expected;  // null for lists
         const MetaStruct* input;
         std::map<std::string, MetaStruct::Field>::const_iterator next;
-        bool sameCount;
     };
 
     bool Refuse(std::string reason) {
@@ -44,11 +43,12 @@ private:
         return false;
     }
 
-    static std::string ComplaintAbout(const Open& place) {
-        return place.expected ? "Type mismatch on field: " + std::prev(place.next)->first
-                              : "List type mismatch list and input";
+    static std::string ComplaintAbout(const Pair& pair) {
+        return pair.expected ? "Type mismatch on field: " + std::prev(pair.next)->first
+                             : "List type mismatch list and input";
     }
 
+    // A pair that has to be looked into is opened, and the same so far.
     bool Enter(const MetaObject& expected, const std::shared_ptr<MetaObject>& other) {
         if (const auto* structure = MetaCast<MetaStruct>(&expected)) {
             return EnterStruct(*structure, other.get());
@@ -74,16 +74,18 @@ private:
         if (input->GetTypeName() != expected.GetTypeName()) {
             Refuse("Type names do not match.");  // which alone makes no difference
         }
-        const auto& fields = expected.GetFields();
-        const bool sameCount = input->GetFields().size() == fields.size();
-        if (!sameCount) {
+        if (!HaveSameCount(expected, *input)) {
             Refuse("Mismatch on number of fields set in struct. Expected " +
-                   std::to_string(fields.size()) + " found " +
+                   std::to_string(expected.GetFields().size()) + " found " +
                    std::to_string(input->GetFields().size()));
         }
         // The fields are looked at even when their count is wrong: the missing one is worth naming.
-        _open.push_back({&expected, input, fields.begin(), sameCount});
+        _open.push_back({&expected, input, expected.GetFields().begin()});
         return true;
+    }
+
+    static bool HaveSameCount(const MetaStruct& expected, const MetaStruct& input) {
+        return expected.GetFields().size() == input.GetFields().size();
     }
 
     bool EnterList(const MetaList& expected, const MetaObject* other) {
@@ -102,106 +104,82 @@ private:
         if (!structure || !input->GetListStructure()) {
             return true;
         }
-        _open.push_back({nullptr, nullptr, {}, true});
+        _open.push_back({nullptr, nullptr, {}});
         return EnterStruct(*structure, input->GetListStructure().get());
     }
 
-    // Goes on behind the part that was found to be the same, up to the next one within this.
-    bool Continue() {
-        Open& place = _open.back();
-        if (place.expected) {
-            const auto& inputs = place.input->GetFields();
-            while (place.next != place.expected->GetFields().end()) {
-                const auto& [name, field] = *place.next++;
-                const auto input = inputs.find(name);
-                if (input == inputs.end()) {
-                    _open.pop_back();
-                    return Refuse("Missing field in input: " + name);
-                }
-                const std::shared_ptr<MetaObject>& value = input->second.value;
-                const MetaType type = field.value->GetType();
-                if (type != value->GetType()) {
-                    return false;
-                }
-                if (type == MetaType::Struct || type == MetaType::List) {
-                    return Enter(*field.value, value);
-                }
-            }
+    // Enters the next part of the innermost pair, or closes the pair behind the last.
+    bool LookOn() {
+        Pair& pair = _open.back();
+        if (!pair.expected) {
+            _open.pop_back();
+            return true;
         }
-        const bool same = place.sameCount;
-        _open.pop_back();
-        return same;
+        if (pair.next == pair.expected->GetFields().end()) {
+            const bool same = HaveSameCount(*pair.expected, *pair.input);
+            _open.pop_back();
+            return same;
+        }
+        const auto& [name, field] = *pair.next++;
+        const auto input = pair.input->GetFields().find(name);
+        if (input == pair.input->GetFields().end()) {
+            _open.pop_back();
+            return Refuse("Missing field in input: " + name);
+        }
+        const std::shared_ptr<MetaObject>& value = input->second.value;
+        return field.value->GetType() == value->GetType() && Enter(*field.value, value);
     }
 
     std::vector<std::string>* const _errors;
     // Comparing is a part of adding each item to a list: at an ordinary depth it allocates nothing.
     static constexpr size_t ordinaryDepth = 8;
-    alignas(Open) std::array<std::byte, ordinaryDepth * sizeof(Open)> _room;
+    alignas(Pair) std::array<std::byte, ordinaryDepth * sizeof(Pair)> _room;
     std::pmr::monotonic_buffer_resource _memory{_room.data(), _room.size()};
-    std::pmr::vector<Open> _open{&_memory};
+    std::pmr::vector<Pair> _open{&_memory};
+};
+
+class PlainText {
+public:
+    static constexpr int fieldDepth = 0;
+    static constexpr int itemDepth = 0;
+
+    static AllFields FieldsOf(const MetaStruct& value) { return AllFields(value); }
+
+    void Bool(bool value, int /*level*/) { _text += MetaBool::New(value)->ToString(); }
+    void Int(long value, int /*level*/) { _text += std::to_string(value); }
+    void String(const std::string& value, int /*level*/) { _text += value; }
+    void Other(const MetaObject* value) { _text += value->ToString(); }
+
+    void OpenStruct(const MetaStruct& /*value*/, int /*level*/) { _text += '{'; }
+    Walk OpenField(const AllFields& field, int /*level*/) {
+        ((_text += '\'') += field.Name()) += "' => '";
+        return Walk::Into;
+    }
+    void CloseField(bool /*isLast*/, int /*level*/) { _text += "', "; }
+    void CloseStruct(int /*level*/) { _text += '}'; }
+
+    static Walk OpenList(const MetaList& /*value*/, int /*level*/) { return Walk::Into; }
+    void OpenItem(int /*level*/) {}
+    void CloseItem(bool isLast) { _text += isLast ? "" : ", "; }
+    void CloseList(int /*level*/) {}
+
+    std::string Take() { return std::move(_text); }
+
+private:
+    std::string _text;
 };
 
 }  // namespace
 
-bool MetaObject::CompareStructure(const MetaObject& expected,
-                                  const std::shared_ptr<MetaObject>& other,
-                                  std::vector<std::string>* errors) {
+bool CompareStructure(const MetaObject& expected, const std::shared_ptr<MetaObject>& other,
+                      std::vector<std::string>* errors) {
     return StructureComparison(errors).Compare(expected, other);
 }
 
-std::string MetaObject::NestedText(const MetaObject& value) {
-    std::string text;
-    std::vector<std::variant<const MetaObject*, std::string_view>> waiting = {&value};
-    while (!waiting.empty()) {
-        const auto next = waiting.back();
-        waiting.pop_back();
-        if (const auto* piece = std::get_if<std::string_view>(&next)) {
-            text += *piece;
-            continue;
-        }
-        const MetaObject* object = std::get<const MetaObject*>(next);
-        if (const auto* structure = MetaCast<MetaStruct>(object)) {
-            text += '{';
-            waiting.emplace_back("}");
-            const auto& fields = structure->GetFields();
-            for (auto field = fields.rbegin(); field != fields.rend(); ++field) {
-                waiting.insert(waiting.end(), {"', ", field->second.value.get(), "' => '",
-                                               std::string_view(field->first), "'"});
-            }
-        } else if (const auto* list = MetaCast<MetaList>(object)) {
-            const auto& items = list->GetObjects();
-            for (auto item = items.rbegin(); item != items.rend(); ++item) {
-                waiting.insert(waiting.end(), {item->get(), ", "});
-            }
-            if (!items.empty()) {
-                waiting.pop_back();  // no separator in front of the first
-            }
-        } else {
-            text += object->ToString();
-        }
-    }
-    return text;
-}
-
-void MetaObject::Release(std::shared_ptr<MetaObject>&& value) {
-    const bool isNested =
-        value && (value->_type == MetaType::Struct || value->_type == MetaType::List);
-    if (!isNested) {
-        return;
-    }
-    thread_local std::vector<std::shared_ptr<MetaObject>>* waiting = nullptr;
-    if (waiting) {
-        waiting->push_back(std::move(value));
-        return;
-    }
-    std::vector<std::shared_ptr<MetaObject>> values;
-    waiting = &values;
-    value.reset();
-    while (!values.empty()) {
-        const auto next = std::move(values.back());
-        values.pop_back();
-    }
-    waiting = nullptr;
+std::string NestedText(const MetaObject& value) {
+    PlainText text;
+    ValueWalk<PlainText>(text).Run(&value, 0);
+    return text.Take();
 }
 
 }  // namespace MetaObj

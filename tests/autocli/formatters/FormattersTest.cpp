@@ -95,8 +95,8 @@ TEST(Formatters, EveryLineEndIsAFlush) {
 
         counter.flushes = 0;
         {
-            const BlockOutput blocks(stream);
-            Write(*formatter, SampleValues()["struct"], stream);
+            BlockOutput blocks(stream);
+            Write(*formatter, SampleValues()["struct"], blocks);
         }
         EXPECT_EQ(counter.flushes, 1) << formatter->GetName();
     }

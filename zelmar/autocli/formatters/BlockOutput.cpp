@@ -4,38 +4,38 @@ namespace {
 
 constexpr std::streamsize blockSize = std::streamsize{64} * 1024;
 
-// Setting a stream's buffer clears its state, which is put back. A stream that is told to throw
-// does so only behind the change, and its owner will hear of the state with the next write.
-void ReplaceBuffer(std::ostream& stream, std::streambuf* buffer, std::ios_base::iostate more) {
-    const auto state = stream.rdstate() | more;
-    try {
-        stream.rdbuf(buffer);
-        stream.setstate(state);
-    } catch (const std::ios_base::failure&) {
-    }
-}
-
 }  // namespace
 
-BlockOutput::BlockOutput(std::ostream& stream)
-    : _stream(stream),
-      _target(stream.rdbuf()),
-      _block(std::make_unique_for_overwrite<char[]>(blockSize)) {
-    setp(_block.get(), _block.get() + blockSize);
-    ReplaceBuffer(_stream, this, std::ios_base::goodbit);
+BlockOutput::BlockOutput(std::ostream& target)
+    : std::ostream(nullptr), _target(target), _blocks(target.rdbuf()) {
+    rdbuf(&_blocks);
+    copyfmt(target);
+    setstate(target.rdstate());
 }
 
 BlockOutput::~BlockOutput() {
-    bool written = false;
     try {
-        written = Drain() && (!_flushWanted || _target->pubsync() == 0);
-    } catch (...) {
-        // A buffer that throws has not written either. Nothing may leave a destructor.
+        _target.setstate(_blocks.Finish() ? rdstate() : rdstate() | badbit);
+    } catch (const failure&) {
+        // The state is set. Nothing may leave a destructor: the owner will hear with the next
+        // write.
     }
-    ReplaceBuffer(_stream, _target, written ? std::ios_base::goodbit : std::ios_base::badbit);
 }
 
-BlockOutput::int_type BlockOutput::overflow(int_type c) {
+BlockOutput::Blocks::Blocks(std::streambuf* target)
+    : _target(target), _block(std::make_unique_for_overwrite<char[]>(blockSize)) {
+    setp(_block.get(), _block.get() + blockSize);
+}
+
+bool BlockOutput::Blocks::Finish() {
+    try {
+        return Drain() && (!_flushWanted || _target->pubsync() == 0);
+    } catch (...) {
+        return false;  // a buffer that throws has not written either
+    }
+}
+
+BlockOutput::Blocks::int_type BlockOutput::Blocks::overflow(int_type c) {
     if (!Drain()) {
         return traits_type::eof();
     }
@@ -43,12 +43,12 @@ BlockOutput::int_type BlockOutput::overflow(int_type c) {
                                                            : sputc(traits_type::to_char_type(c));
 }
 
-int BlockOutput::sync() {
+int BlockOutput::Blocks::sync() {
     _flushWanted = true;
     return 0;
 }
 
-bool BlockOutput::Drain() {
+bool BlockOutput::Blocks::Drain() {
     const std::streamsize size = pptr() - pbase();
     setp(_block.get(), _block.get() + blockSize);
     return _target && (size == 0 || _target->sputn(_block.get(), size) == size);

@@ -4,26 +4,37 @@
 #include <ostream>
 #include <streambuf>
 
-/// Wraps the buffer of a stream for as long as this lives: what is written gathers in blocks of
-/// 64 KiB, whatever flushes stand in between, and reaches the stream's own buffer block by block
-/// and at the end. A flush that was asked for is made up for at the end, once. The stream's flags
-/// and state stay its own throughout; a block that cannot be written sets its badbit.
-class BlockOutput : public std::streambuf {
+/// A stream in front of another one: what is written gathers in blocks of 64 KiB, whatever flushes
+/// stand in between, and reaches the target's buffer block by block and at the end. A flush that
+/// was asked for is made up for at the end, once.
+///
+/// It begins with the target's format and state. At the end the target is told of the state, with
+/// its badbit set when a block could not be written; nothing else of the target is touched, so that
+/// several threads may each have one in front of `std::cout`.
+class BlockOutput : public std::ostream {
 public:
-    explicit BlockOutput(std::ostream& stream);
-    BlockOutput(const BlockOutput&) = delete;
-    BlockOutput& operator=(const BlockOutput&) = delete;
+    explicit BlockOutput(std::ostream& target);
     ~BlockOutput() override;
 
-protected:
-    int_type overflow(int_type c) override;
-    int sync() override;
-
 private:
-    bool Drain();
+    class Blocks : public std::streambuf {
+    public:
+        explicit Blocks(std::streambuf* target);
+        /// Writes what is left. False when that cannot be done.
+        bool Finish();
 
-    std::ostream& _stream;
-    std::streambuf* const _target;
-    const std::unique_ptr<char[]> _block;
-    bool _flushWanted = false;
+    protected:
+        int_type overflow(int_type c) override;
+        int sync() override;
+
+    private:
+        bool Drain();
+
+        std::streambuf* const _target;
+        const std::unique_ptr<char[]> _block;
+        bool _flushWanted = false;
+    };
+
+    std::ostream& _target;
+    Blocks _blocks;
 };

@@ -1,11 +1,10 @@
 #include <zelmar/ZelmarException.h>
 #include <zelmar/autocli/formatters/CommandHelpFormatter.h>
-#include <zelmar/autocli/formatters/FitString.h>
+#include <zelmar/autocli/formatters/FitText.h>
 #include <zelmar/metaobj/MetaList.h>
 #include <zelmar/metaobj/MetaScalars.h>
 
 #include <algorithm>
-#include <ostream>
 
 using MetaObj::MetaBool;
 using MetaObj::MetaCast;
@@ -46,44 +45,60 @@ std::string TaggedDescription(const std::shared_ptr<MetaStruct>& parameter) {
     return isSecret ? text + secretWarning : text;
 }
 
-void WriteParameter(const std::shared_ptr<MetaStruct>& parameter, size_t column, int width,
-                    std::ostream& out) {
+constexpr std::string_view withoutShortName = "     --";
+constexpr size_t nameGap = 3;  // between the longest name and the descriptions
+constexpr int exampleIndent = 4;
+constexpr int syntaxTail = 8;  // blanks behind each
+
+void WriteParameter(const std::shared_ptr<MetaStruct>& parameter, size_t nameWidth, int screenWidth,
+                    TextWriter& out) {
     const std::string name = GetStringField(parameter, "Name");
     const std::string shortName = GetStringField(parameter, "Short Name");
     const std::string description = TaggedDescription(parameter);
-    out << (shortName.empty() ? "     --" : "  -" + shortName + "|--") << name
-        << std::string(column + 2 - name.size(), ' ');
-    if (description.empty()) {
-        out << std::endl;
+    if (shortName.empty()) {
+        out.Append(withoutShortName, name);
     } else {
-        AutoCli_FitString(static_cast<int>(column) + 9, width, description, true, out, true, 0,
-                          true);
+        out.Append("  -", shortName, "|--", name);
+    }
+    out.AppendBlanks(nameWidth - name.size());
+    if (description.empty()) {
+        out.EndLine();
+        return;
+    }
+    FitText(description,
+            {.indent = static_cast<int>(withoutShortName.size() + nameWidth),
+             .width = screenWidth,
+             .skipFirstIndent = true,
+             .endLine = true,
+             .splitLines = true},
+            out);
+}
+
+void WriteParameters(const MetaList& list, int screenWidth, TextWriter& out) {
+    size_t longest = 0;
+    for (const auto& item : list.GetObjects()) {
+        longest = std::max(longest, GetStringField(AsStruct(item), "Name").size());
+    }
+    for (const auto& item : list.GetObjects()) {
+        if (const auto parameter = AsStruct(item)) {
+            WriteParameter(parameter, longest + nameGap, screenWidth, out);
+        }
     }
 }
 
-void WriteParameters(const MetaList& list, int width, std::ostream& out) {
-    size_t column = 0;
-    for (const auto& item : list.GetObjects()) {
-        if (const auto parameter = AsStruct(item)) {
-            column = std::max(column, GetStringField(parameter, "Name").size() + 1);
-        }
-    }
-    for (const auto& item : list.GetObjects()) {
-        if (const auto parameter = AsStruct(item)) {
-            WriteParameter(parameter, column, width, out);
-        }
-    }
-}
-
-void WriteExamples(const MetaList& list, int width, std::ostream& out) {
-    out << std::endl << "Examples: " << std::endl << std::endl;
+void WriteExamples(const MetaList& list, int screenWidth, TextWriter& out) {
+    out.EndLine();
+    out.Append("Examples: ");
+    out.EndLine();
+    out.EndLine();
     for (const auto& item : list.GetObjects()) {
         const auto example = AsStruct(item);
-        AutoCli_FitString(4, width, GetStringField(example, "Description"), false, out, true, 0,
-                          false);
-        out << GetStringField(example, "Syntax");
-        AutoCli_FitString(8, width, "", false, out, true, 0, false);
-        out << std::endl;
+        FitText(GetStringField(example, "Description"),
+                {.indent = exampleIndent, .width = screenWidth, .endLine = true}, out);
+        out.Append(GetStringField(example, "Syntax"));
+        out.AppendBlanks(syntaxTail);
+        out.EndLine();
+        out.EndLine();
     }
 }
 
@@ -109,19 +124,23 @@ bool CommandHelpFormatter::Format(const std::shared_ptr<CallSpec::Output>& outpu
         throw ZelmarException(
             "Error: Unexpected type for output, formatter expected a struct with help information");
     }
-    const int width = context.screenWidth;
-    stream << "Usage: " << GetStringField(help, "Dispatcher") << " " << GetStringField(help, "Path")
-           << " <options>" << std::endl
-           << std::endl;
-    stream << "Description: " << GetStringField(help, "Description") << std::endl << std::endl;
+    TextWriter text(stream);
+    text.Append("Usage: ", GetStringField(help, "Dispatcher"), " ", GetStringField(help, "Path"),
+                " <options>");
+    text.EndLine();
+    text.EndLine();
+    text.Append("Description: ", GetStringField(help, "Description"));
+    text.EndLine();
+    text.EndLine();
     const auto parameters = help->GetField("Param List");
     if (const auto* list = MetaCast<MetaList>(parameters.get())) {
-        WriteParameters(*list, width, stream);
+        WriteParameters(*list, context.screenWidth, text);
     }
     const auto examples = help->GetField("Example List");
     if (const auto* list = MetaCast<MetaList>(examples.get()); list && list->GetCount() > 0) {
-        WriteExamples(*list, width, stream);
+        WriteExamples(*list, context.screenWidth, text);
     }
+    text.Finish();
     return true;
 }
 

@@ -1,83 +1,69 @@
 #include <zelmar/autocli/formatters/FitString.h>
+#include <zelmar/autocli/formatters/FitText.h>
 #include <zelmar/internal/Split.h>
 
 #include <algorithm>
-#include <ostream>
-#include <string_view>
-
-namespace AutoCli {
 
 namespace {
 
-// One line of text in the room between two columns.
-class LineFitter {
-public:
-    LineFitter(int indent, long room, char breakChar, std::ostream& out)
-        : _indentation(static_cast<size_t>(std::max(indent, 1)), ' '),
-          _room(room),
-          _break(breakChar == 0 ? ' ' : breakChar),
-          _out(out) {}
+void AppendIndentation(const Fit& fit, TextWriter& out) {
+    out.AppendBlanks(static_cast<size_t>(std::max(fit.indent, 1)));
+}
 
-    void WriteIndentation() { Write(_indentation); }
-
-    void Fit(std::string_view text) {
-        if (_room <= 0 || text.size() <= static_cast<size_t>(_room)) {
-            Write(text);
-            return;
+// One line of text in the room between the two columns.
+void FitLine(std::string_view text, const Fit& fit, TextWriter& out) {
+    const long room = static_cast<long>(fit.width) - fit.indent;
+    if (room <= 0 || text.size() <= static_cast<size_t>(room)) {
+        out.Append(text);
+        return;
+    }
+    const char lineBreak = fit.breakChar == 0 ? ' ' : fit.breakChar;
+    long left = room;
+    bool isFirst = true;
+    ForEachPiece(text, ' ', [&](std::string_view word) {
+        const long taken = static_cast<long>(word.size()) + 1;  // each counts a blank behind it
+        left -= taken;
+        if (left < 0) {
+            out.Append(std::string_view(&lineBreak, 1));
+            out.EndLine();
+            AppendIndentation(fit, out);
+            left = room - taken;
+        } else if (!isFirst) {
+            out.AppendBlanks(1);
         }
-        long left = _room;
-        bool isFirst = true;
-        ForEachPiece(text, ' ', [&](std::string_view word) {
-            const long taken = static_cast<long>(word.size()) + 1;  // each counts a blank behind it
-            left -= taken;
-            if (left < 0) {
-                _out.put(_break) << std::endl;
-                WriteIndentation();
-                left = _room - taken;
-            } else if (!isFirst) {
-                _out.put(' ');
-            }
-            Write(word);
-            isFirst = false;
-        });
-    }
-
-private:
-    void Write(std::string_view text) {
-        _out.write(text.data(), static_cast<std::streamsize>(text.size()));
-    }
-
-    const std::string _indentation;
-    const long _room;
-    const char _break;
-    std::ostream& _out;
-};
+        out.Append(word);
+        isFirst = false;
+    });
+}
 
 }  // namespace
 
-void AutoCli_FitString(const int& indent, const int& width, const std::string& text,
-                       bool skipFirstIndent, std::ostream& out, bool endLine, char breakChar,
-                       bool splitLines) {
-    LineFitter fitter(indent, static_cast<long>(width) - indent, breakChar, out);
+void FitText(std::string_view text, const Fit& fit, TextWriter& out) {
     bool isFirst = true;
     const auto fitLine = [&](std::string_view line) {
-        if (!isFirst && !endLine) {
-            out << std::endl;
+        if (!isFirst && !fit.endLine) {
+            out.EndLine();
         }
-        if (!isFirst || !skipFirstIndent) {
-            fitter.WriteIndentation();
+        if (!isFirst || !fit.skipFirstIndent) {
+            AppendIndentation(fit, out);
         }
-        fitter.Fit(line);
-        if (endLine) {
-            out << std::endl;
+        FitLine(line, fit, out);
+        if (fit.endLine) {
+            out.EndLine();
         }
         isFirst = false;
     };
-    if (splitLines) {
+    if (fit.splitLines) {
         ForEachPiece(text, '\n', fitLine);
     } else {
         fitLine(text);
     }
 }
 
-}  // namespace AutoCli
+void AutoCli::AutoCli_FitString(const int& indent, const int& width, const std::string& text,
+                                bool skipFirstIndent, std::ostream& out, bool endLine,
+                                char breakChar, bool splitLines) {
+    TextWriter writer(out);
+    FitText(text, {indent, width, skipFirstIndent, endLine, breakChar, splitLines}, writer);
+    writer.Finish();
+}

@@ -1,3 +1,4 @@
+#include <zelmar/autocli/formatters/FieldText.h>
 #include <zelmar/autocli/formatters/Formatter.h>
 #include <zelmar/autocli/formatters/SafePrintf.h>
 #include <zelmar/metaobj/MetaScalars.h>
@@ -16,11 +17,6 @@ using MetaObj::MetaStruct;
 namespace AutoCli {
 
 namespace {
-
-bool HasKeyWithPrefix(const FormatParameters& parameters, const std::string& prefix) {
-    const auto key = parameters.GetParameters().lower_bound(prefix);
-    return key != parameters.GetParameters().end() && key->first.starts_with(prefix);
-}
 
 // False when the format fails; a struct or a list has no printf argument and comes out empty.
 bool ApplyPrintf(const std::string& format, const MetaObject& value, std::string& text) {
@@ -43,19 +39,12 @@ bool ApplyPrintf(const std::string& format, const MetaObject& value, std::string
 
 Formatter::~Formatter() = default;
 
-bool HasFieldFormats(const FormatParameters& parameters) {
-    return HasKeyWithPrefix(parameters, "printf:") || HasKeyWithPrefix(parameters, "units:");
-}
-
 std::string AutoCli_FormatField(const std::string& typeName, const std::string& fieldName,
                                 std::shared_ptr<MetaObject> value, FormatParameters& parameters) {
     if (!value) {
         return "NULL Object";
     }
     std::string text = value->ToString();
-    if (!HasFieldFormats(parameters)) {
-        return text;
-    }
     const std::string field = typeName + "." + fieldName;
     const std::string printfKey = "printf:" + field;
     if (parameters.HasParameter(printfKey) &&
@@ -76,21 +65,8 @@ std::string GetIndent(int level) {
 
 std::shared_ptr<MetaObject> GetSubField(std::shared_ptr<MetaStruct> structure,
                                         const std::string& path) {
-    size_t start = 0;
-    while (true) {
-        const size_t dot = path.find('.', start);
-        auto value = structure->GetField(path.substr(start, dot - start));
-        if (dot == std::string::npos) {
-            return value;
-        }
-        if (value) {
-            structure = std::dynamic_pointer_cast<MetaStruct>(value);
-            if (!structure) {
-                return nullptr;
-            }
-        }
-        start = dot + 1;
-    }
+    const auto* value = FindSubField(*structure, path);
+    return value ? *value : nullptr;
 }
 
 }  // namespace AutoCli

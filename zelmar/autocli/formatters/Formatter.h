@@ -27,8 +27,9 @@ struct ZELMAR_EXPORT DisplayContext {
     std::string extra;
 };
 
-/// Turns the value of an output into text. A formatter keeps no state between calls. Its list of
-/// parameters is documentation: parameters outside it are not refused.
+/// Turns the value of an output into text. A formatter keeps no state between calls, so that
+/// several threads may use one, each with parameters, a context and a stream of its own. Its list
+/// of parameters is documentation: parameters outside it are not refused.
 class ZELMAR_EXPORT Formatter {
 public:
     explicit Formatter(const std::string& name) : _name(name) {}
@@ -59,16 +60,13 @@ private:
 /// A printf format holds at most one conversion: an integer conversion for Int and Bool, `s` for
 /// String, with flags, decimal width and precision; a struct or list comes out empty. Any other
 /// format gives "Error while handling formatting parameter <key>.  Unable to format field: " and
-/// the system's text for an invalid argument. The formatted text is cut at the length of the format
-/// plus that of the value plus 64 bytes.
+/// the system's text for an invalid argument, or for a value too large where a width or precision
+/// is beyond an `int`. The formatted text is cut at the length of the format plus that of the value
+/// plus 64 bytes.
 ZELMAR_EXPORT std::string AutoCli_FormatField(const std::string& typeName,
                                               const std::string& fieldName,
                                               std::shared_ptr<MetaObj::MetaObject> value,
                                               FormatParameters& parameters);
-
-/// Is there any parameter at all that `AutoCli_FormatField` would heed? Where there is none, it
-/// gives the value's own text.
-ZELMAR_EXPORT bool HasFieldFormats(const FormatParameters& parameters);
 
 /// Three blanks for each level; none below level 1.
 ZELMAR_EXPORT std::string GetIndent(int level);

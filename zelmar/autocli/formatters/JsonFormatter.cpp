@@ -1,6 +1,11 @@
 #include <zelmar/autocli/formatters/Escape.h>
 #include <zelmar/autocli/formatters/JsonFormatter.h>
-#include <zelmar/autocli/formatters/ValueWalk.h>
+#include <zelmar/autocli/formatters/ValueWriter.h>
+
+using MetaObj::AllFields;
+using MetaObj::MetaList;
+using MetaObj::MetaStruct;
+using MetaObj::Walk;
 
 namespace AutoCli {
 
@@ -43,18 +48,18 @@ public:
         _text.Append("\"");
     }
 
-    void OpenStruct(const MetaObj::MetaStruct& /*value*/, int level) { OpenBracket("{", level); }
-    bool OpenField(const AllFields& field, int level) {
+    void OpenStruct(const MetaStruct& /*value*/, int level) { OpenBracket("{", level); }
+    Walk OpenField(const AllFields& field, int level) {
         _text.AppendIndent(level);
         _text.Append("   \"", field.Name(), "\": ");
-        return true;
+        return Walk::Into;
     }
     void CloseField(bool isLast, int /*level*/) { WriteLine(isLast ? "" : ","); }
     void CloseStruct(int level) { CloseBracket("}", level); }
 
-    bool OpenList(const MetaObj::MetaList& /*value*/, int level) {
+    Walk OpenList(const MetaList& /*value*/, int level) {
         OpenBracket("[", level);
-        return true;
+        return Walk::Into;
     }
     void OpenItem(int level) { _text.AppendIndent(level); }
     void CloseItem(bool isLast) { WriteLine(isLast ? "" : ", "); }
@@ -81,14 +86,18 @@ JsonFormatter::JsonFormatter() : Formatter("json") {
 bool JsonFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
                            FormatParameters& /*parameters*/, DisplayContext& /*context*/,
                            std::ostream& stream) {
-    Format(output->GetRootObject(), stream, -1);
-    stream << std::endl;
+    TextWriter text(stream);
+    WriteValue<JsonWriter>(text, output->GetRootObject().get(), -1);
+    text.EndLine();
+    text.Finish();
     return true;
 }
 
 void JsonFormatter::Format(const std::shared_ptr<MetaObj::MetaObject>& value, std::ostream& stream,
                            int level) const {
-    WriteValue<JsonWriter>(stream, value.get(), level);
+    TextWriter text(stream);
+    WriteValue<JsonWriter>(text, value.get(), level);
+    text.Finish();
 }
 
 }  // namespace AutoCli

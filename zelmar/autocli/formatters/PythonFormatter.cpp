@@ -1,7 +1,13 @@
 #include <zelmar/ZelmarException.h>
 #include <zelmar/autocli/formatters/Escape.h>
 #include <zelmar/autocli/formatters/PythonFormatter.h>
-#include <zelmar/autocli/formatters/ValueWalk.h>
+#include <zelmar/autocli/formatters/ValueWriter.h>
+
+using MetaObj::AllFields;
+using MetaObj::MetaList;
+using MetaObj::MetaObject;
+using MetaObj::MetaStruct;
+using MetaObj::Walk;
 
 namespace AutoCli {
 
@@ -31,21 +37,28 @@ public:
         _text.Append(R"(""")");
     }
 
-    void OpenStruct(const MetaObj::MetaStruct& /*value*/, int /*level*/) { _text.Append("{"); }
-    bool OpenField(const AllFields& field, int /*level*/) {
+    void OpenStruct(const MetaStruct& /*value*/, int /*level*/) { _text.Append("{"); }
+    Walk OpenField(const AllFields& field, int /*level*/) {
         _text.Append("\"", field.Name(), "\": ");
-        return true;
+        return Walk::Into;
     }
     void CloseField(bool /*isLast*/, int /*level*/) { _text.Append(", "); }
     void CloseStruct(int /*level*/) { _text.Append("}"); }
 
-    bool OpenList(const MetaObj::MetaList& /*value*/, int /*level*/) {
+    Walk OpenList(const MetaList& /*value*/, int /*level*/) {
         _text.Append("[");
-        return true;
+        return Walk::Into;
     }
     void CloseItem(bool /*isLast*/) { _text.Append(", "); }
     void CloseList(int /*level*/) { _text.Append("]"); }
 };
+
+void Write(const MetaObject* value, TextWriter& text, int level) {
+    if (!value) {
+        throw Zelmar::ZelmarException("Invalid MetaObject passed to Format in PythonFormatter");
+    }
+    WriteValue<PythonWriter>(text, value, level);
+}
 
 }  // namespace
 
@@ -56,17 +69,18 @@ PythonFormatter::PythonFormatter() : Formatter("python") {
 bool PythonFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
                              FormatParameters& /*parameters*/, DisplayContext& /*context*/,
                              std::ostream& stream) {
-    Format(output->GetRootObject(), stream, 2);
-    stream << std::endl;
+    TextWriter text(stream);
+    Write(output->GetRootObject().get(), text, 2);
+    text.EndLine();
+    text.Finish();
     return true;
 }
 
-void PythonFormatter::Format(const std::shared_ptr<MetaObj::MetaObject>& value,
-                             std::ostream& stream, int level) const {
-    if (!value) {
-        throw Zelmar::ZelmarException("Invalid MetaObject passed to Format in PythonFormatter");
-    }
-    WriteValue<PythonWriter>(stream, value.get(), level);
+void PythonFormatter::Format(const std::shared_ptr<MetaObject>& value, std::ostream& stream,
+                             int level) const {
+    TextWriter text(stream);
+    Write(value.get(), text, level);
+    text.Finish();
 }
 
 bool PythonFormatter::IsAllAscii(const std::string& text) {

@@ -100,6 +100,7 @@ private:
         for (; !_rest.empty() && Ascii::IsDigit(_rest[0]); _rest.remove_prefix(1)) {
             number = number * 10 + (_rest[0] - '0');
             if (number > INT_MAX) {
+                errno = EOVERFLOW;
                 return false;
             }
         }
@@ -120,9 +121,9 @@ private:
 template <class Value>
 bool Format(const std::string& format, const ArgumentKind& kind, Value value, size_t limit,
             std::string& result) {
+    errno = EINVAL;  // unless the reader knows better
     const auto safe = FormatReader(format.c_str(), kind, limit).Read();
     if (!safe) {
-        errno = EINVAL;
         return false;
     }
     std::string buffer(limit + 1, '\0');

@@ -8,7 +8,7 @@
 /// taken, whatever width the format asks for.
 ///
 /// The result is cut at `limit` bytes. False, with the reason in `errno`, when the format is
-/// refused (EINVAL) or the system's own printf fails.
+/// refused (EINVAL; EOVERFLOW for a number beyond an int) or the system's own printf fails.
 [[nodiscard]] bool FormatSafely(const std::string& format, long value, size_t limit,
                                 std::string& result);
 [[nodiscard]] bool FormatSafely(const std::string& format, const char* value, size_t limit,

@@ -1,5 +1,6 @@
+#include <zelmar/autocli/formatters/FieldText.h>
 #include <zelmar/autocli/formatters/SimpleFormatter.h>
-#include <zelmar/autocli/formatters/ValueWalk.h>
+#include <zelmar/autocli/formatters/ValueWriter.h>
 
 #include <boost/algorithm/string/replace.hpp>
 #include <optional>
@@ -9,6 +10,7 @@ using MetaObj::MetaList;
 using MetaObj::MetaObject;
 using MetaObj::MetaStruct;
 using MetaObj::MetaType;
+using MetaObj::Walk;
 
 namespace AutoCli {
 
@@ -55,14 +57,11 @@ std::string HeadingOf(const MetaStruct& value, const Style& style) {
 // not be there.
 class ChosenFields {
 public:
-    ChosenFields(const MetaStruct& value, const Style& style, bool aligned)
+    ChosenFields(const MetaStruct& value, const Style& style)
         : _struct(value), _field(value.GetFields().begin()) {
         if (style.fields) {
             _names = *style.fields;
             Find();
-        }
-        if (aligned) {
-            Measure();
         }
     }
 
@@ -77,17 +76,15 @@ public:
             ++_field;
         }
     }
-    void LeaveOutTheRest() { _names = _names->first(1); }
 
     [[nodiscard]] const std::string& TypeName() const { return _struct.GetTypeName(); }
     [[nodiscard]] const std::string& Name() const {
         return _names ? _names->front() : _field->first;
     }
     /// Null when the struct has no such field.
-    [[nodiscard]] std::shared_ptr<MetaObject> Value() const {
-        return _field == _struct.GetFields().end() ? nullptr : _field->second.value;
+    [[nodiscard]] const std::shared_ptr<MetaObject>* Value() const {
+        return _field == _struct.GetFields().end() ? nullptr : &_field->second.value;
     }
-    [[nodiscard]] size_t Padding() const { return _width > 0 ? _width - Name().size() : 0; }
 
 private:
     void Find() {
@@ -95,16 +92,15 @@ private:
             _field = _struct.GetFields().find(Name());
         }
     }
-    void Measure() {
-        for (ChosenFields rest = *this; !rest.AtEnd(); rest.Advance()) {
-            _width = std::max(_width, rest.Name().size());
-        }
-    }
 
     const MetaStruct& _struct;
     std::map<std::string, MetaStruct::Field>::const_iterator _field;
     std::optional<std::span<const std::string>> _names;  // those that are still to come
-    size_t _width = 0;  // of the longest name; 0 when names are not aligned
+};
+
+// All names of a struct take the same room.
+struct AlignedFields : ChosenFields {
+    size_t nameWidth = 0;  // 0 when they are not aligned
 };
 
 class SimpleWriter : public ValueWriter {
@@ -115,8 +111,8 @@ public:
     SimpleWriter(TextWriter& text, FormatParameters& parameters)
         : ValueWriter(text),
           _parameters(parameters),
-          _hasFieldFormats(HasFieldFormats(parameters)),
-          _aligned(parameters.GetParameter("align-fields") == "true") {}
+          _fieldText(parameters),
+          _aligns(parameters.GetParameter("align-fields") == "true") {}
 
     void Bool(bool value, int /*level*/) { WriteLine(value ? "true" : "false"); }
     void Int(long value, int /*level*/) {
@@ -131,41 +127,48 @@ public:
             WriteLine(heading, ":");
         }
     }
-    ChosenFields FieldsOf(const MetaStruct& value) { return {value, StyleOf(value), _aligned}; }
-    bool OpenField(ChosenFields& field, int level) {
-        const auto value = field.Value();
+    AlignedFields FieldsOf(const MetaStruct& value) {
+        const ChosenFields fields(value, StyleOf(value));
+        return {fields, _aligns ? LongestName(fields) : 0};
+    }
+    Walk OpenField(const AlignedFields& field, int level) {
+        const auto* value = field.Value();
         if (!value) {
             WriteLine("Error getting field ", field.Name());
-            field.LeaveOutTheRest();
-            return false;
+            return Walk::Out;
         }
+        const std::string& name = field.Name();
         _text.AppendIndent(level);
-        _text.Append("   ", field.Name());
-        _text.AppendBlanks(field.Padding());
+        _text.Append("   ", name);
+        _text.AppendBlanks(std::max(field.nameWidth, name.size()) - name.size());
         _text.Append(": ");
-        switch (value->GetType()) {
+        switch ((*value)->GetType()) {
             case MetaType::Struct:
                 _text.EndLine();
-                return true;
+                return Walk::Into;
             case MetaType::List:
-                return true;
+                return Walk::Into;
             default:
-                WriteScalar(field, value);
-                return false;
+                WriteLine(_fieldText.Of(field.TypeName(), name, *value));
+                return Walk::Past;
         }
     }
 
-    bool OpenList(const MetaList& value, int /*level*/) {
+    Walk OpenList(const MetaList& value, int /*level*/) {
         if (value.GetListType() == MetaType::Struct) {
-            return true;
+            return Walk::Into;
         }
         WriteScalars(value);
-        return false;
+        return Walk::Past;
     }
     void OpenItem(int /*level*/) { _text.EndLine(); }
     void CloseList(int /*level*/) { _text.EndLine(); }
 
-    void Unknown() {}
+    void Other(const MetaObject* value) {
+        if (const auto complaint = ComplaintAbout(value); !complaint.empty()) {
+            WriteLine(complaint);
+        }
+    }
 
 private:
     const Style& StyleOf(const MetaStruct& value) {
@@ -176,13 +179,12 @@ private:
                    : _styles.try_emplace(typeName, typeName, _parameters).first->second;
     }
 
-    void WriteScalar(const ChosenFields& field, const std::shared_ptr<MetaObject>& value) {
-        const auto* text = MetaObj::MetaCast<MetaObj::MetaString>(value.get());
-        if (text && !_hasFieldFormats) {
-            WriteLine(text->GetValue());  // itself, without a copy
-        } else {
-            WriteLine(AutoCli_FormatField(field.TypeName(), field.Name(), value, _parameters));
+    static size_t LongestName(ChosenFields fields) {
+        size_t width = 0;
+        for (; !fields.AtEnd(); fields.Advance()) {
+            width = std::max(width, fields.Name().size());
         }
+        return width;
     }
 
     // What ToString of the list gives, without a copy of it all.
@@ -195,9 +197,9 @@ private:
         _text.EndLine();
     }
 
-    FormatParameters& _parameters;
-    const bool _hasFieldFormats;
-    const bool _aligned;
+    const FormatParameters& _parameters;
+    FieldText _fieldText;
+    const bool _aligns;
     std::map<std::string, Style> _styles;  // by the name of the type
 };
 
@@ -250,7 +252,9 @@ bool SimpleFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
 
 void SimpleFormatter::Format(const std::shared_ptr<MetaObject>& value, FormatParameters& parameters,
                              std::ostream& stream, int level) const {
-    WriteValue<SimpleWriter>(stream, value.get(), level, parameters);
+    TextWriter text(stream);
+    WriteValue<SimpleWriter>(text, value.get(), level, parameters);
+    text.Finish();
 }
 
 void SimpleFormatter::FormatStruct(const std::shared_ptr<MetaStruct>& value,

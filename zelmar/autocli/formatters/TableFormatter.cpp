@@ -1,20 +1,16 @@
 #include <zelmar/ZelmarException.h>
-#include <zelmar/autocli/formatters/FitString.h>
+#include <zelmar/autocli/formatters/FieldText.h>
+#include <zelmar/autocli/formatters/FitText.h>
 #include <zelmar/autocli/formatters/TableFormatter.h>
-#include <zelmar/autocli/formatters/TextWriter.h>
 #include <zelmar/metaobj/MetaList.h>
-#include <zelmar/metaobj/MetaScalars.h>
 
 #include <algorithm>
-#include <charconv>
 #include <ostream>
 #include <string_view>
 
 using MetaObj::MetaCast;
-using MetaObj::MetaInt;
 using MetaObj::MetaList;
 using MetaObj::MetaObject;
-using MetaObj::MetaString;
 using MetaObj::MetaStruct;
 using MetaObj::MetaType;
 using Zelmar::ZelmarException;
@@ -61,31 +57,31 @@ using Value = std::shared_ptr<MetaObject>;
 // One struct of the list, which is asked for the values of the columns in their order.
 class Row {
 public:
-    explicit Row(const Value& item)
-        : _item(item), _fields(static_cast<const MetaStruct&>(*item).GetFields()) {}
+    explicit Row(const MetaStruct& item) : _item(item) {}
 
-    const std::string& GetTypeName() const {
-        return static_cast<const MetaStruct&>(*_item).GetTypeName();
-    }
+    const std::string& GetTypeName() const { return _item.GetTypeName(); }
 
-    // Null when the row lacks it. Lives until the next call.
-    const Value& ValueOf(const Column& column) {
+    // Null when the row lacks it.
+    const Value* ValueOf(const Column& column) {
         if (column.isPath) {
-            return _subValue =
-                       GetSubField(std::static_pointer_cast<MetaStruct>(_item), column.name);
+            return FindSubField(_item, column.name);
         }
         // Columns mostly stand in the order of the fields: then the next one needs no search.
-        if (_next == _fields.end() || _next->first != column.name) {
-            _next = _fields.find(column.name);
+        const auto& fields = _item.GetFields();
+        if (_next == fields.end() || _next->first != column.name) {
+            _next = fields.find(column.name);
         }
-        return _next == _fields.end() ? _subValue = nullptr : (_next++)->second.value;
+        if (_next == fields.end()) {
+            return nullptr;
+        }
+        const Value& value = _next->second.value;
+        ++_next;
+        return &value;
     }
 
 private:
-    const Value& _item;
-    const std::map<std::string, MetaStruct::Field>& _fields;
-    std::map<std::string, MetaStruct::Field>::const_iterator _next = _fields.begin();
-    Value _subValue;
+    const MetaStruct& _item;
+    std::map<std::string, MetaStruct::Field>::const_iterator _next = _item.GetFields().begin();
 };
 
 // One call of the formatter: what the columns are, and how wide.
@@ -93,11 +89,7 @@ class Table {
 public:
     Table(const MetaList& list, FormatParameters& parameters, const DisplayContext& context,
           std::ostream& out)
-        : _list(list),
-          _parameters(parameters),
-          _hasFieldFormats(HasFieldFormats(parameters)),
-          _out(out),
-          _text(out) {
+        : _list(list), _parameters(parameters), _cells(parameters), _text(out) {
         auto names = ColumnNames(*list.GetListStructure(), parameters);
         std::ranges::transform(names, names.begin(), Trimmed);
         for (const std::string& name : names) {
@@ -107,68 +99,41 @@ public:
         _screenWidth = parameters.GetParameter("wrap-last") == "true" ? context.screenWidth : 0;
     }
 
-    // False after an error that was written to the stream.
-    bool Measure() {
-        for (const auto& item : _list.GetObjects()) {
-            if (!MetaCast<MetaStruct>(item.get())) {
-                _out << "Error: Unexpected type, unable to get struct from list" << std::endl;
-                return false;
+    // False after an error that was written instead of the table.
+    bool Write() {
+        const std::string error = Measure();
+        if (error.empty()) {
+            if (ShowsHeader(_parameters) && !_columns.empty()) {
+                WriteHeader();
             }
-            Row row(item);
-            for (Column& column : _columns) {
-                const auto& value = row.ValueOf(column);
-                if (!value) {
-                    _out << "Error: Unknown field in field list: " << column.name << std::endl;
-                    return false;
-                }
-                column.width =
-                    std::max(column.width, CellText(row, column, value).size() + columnGap);
-            }
-        }
-        return true;
-    }
-
-    void Write() {
-        _out.setf(std::ios_base::left, std::ios_base::adjustfield);
-        if (ShowsHeader(_parameters) && !_columns.empty()) {
-            WriteHeader();
-        }
-        const size_t startColumn = WidthBeforeLast();
-        const bool wraps = !_columns.empty() && startColumn > 0 &&
-                           startColumn + _columns.back().name.size() <= _screenWidth;
-        for (const auto& item : _list.GetObjects()) {
-            Row row(item);
-            for (const Column& column : _columns) {
-                const auto& value = row.ValueOf(column);
-                if (wraps && column.isLast) {
-                    _text.Finish();
-                    AutoCli_FitString(static_cast<int>(startColumn), static_cast<int>(_screenWidth),
-                                      value->ToString(), true, _out, false, 0, true);
-                } else {
-                    AppendCell(column, CellText(row, column, value),
-                               value->GetType() == MetaType::Int);
-                }
-            }
+            WriteRows();
+        } else {
+            _text.Append(error);
             _text.EndLine();
         }
         _text.Finish();
+        return error.empty();
     }
 
 private:
-    // Lives until the next call. No string is made where the value's own text will do.
-    std::string_view CellText(const Row& row, const Column& column, const Value& value) {
-        if (_hasFieldFormats) {
-            return _cell = AutoCli_FormatField(row.GetTypeName(), column.name, value, _parameters);
+    // The error, where there is one.
+    std::string Measure() {
+        for (const auto& item : _list.GetObjects()) {
+            const auto* structure = MetaCast<MetaStruct>(item.get());
+            if (!structure) {
+                return "Error: Unexpected type, unable to get struct from list";
+            }
+            Row row(*structure);
+            for (Column& column : _columns) {
+                const Value* value = row.ValueOf(column);
+                if (!value) {
+                    return "Error: Unknown field in field list: " + column.name;
+                }
+                const auto text = _cells.Of(row.GetTypeName(), column.name, *value);
+                column.width = std::max(column.width, text.size() + columnGap);
+            }
         }
-        if (const auto* text = MetaCast<MetaString>(value.get())) {
-            return text->GetValue();
-        }
-        if (const auto* number = MetaCast<MetaInt>(value.get())) {
-            const auto end =
-                std::to_chars(std::begin(_digits), std::end(_digits), number->GetValue());
-            return {_digits, end.ptr};
-        }
-        return _cell = value->ToString();
+        return "";
     }
 
     size_t WidthBeforeLast() const {
@@ -197,6 +162,29 @@ private:
         _text.EndLine();
     }
 
+    void WriteRows() {
+        const size_t lastColumn = WidthBeforeLast();
+        const bool wraps = !_columns.empty() && lastColumn > 0 &&
+                           lastColumn + _columns.back().name.size() <= _screenWidth;
+        const Fit fit = {.indent = static_cast<int>(lastColumn),
+                         .width = static_cast<int>(_screenWidth),
+                         .skipFirstIndent = true,
+                         .splitLines = true};
+        for (const auto& item : _list.GetObjects()) {
+            Row row(static_cast<const MetaStruct&>(*item));
+            for (const Column& column : _columns) {
+                const Value& value = *row.ValueOf(column);
+                if (wraps && column.isLast) {
+                    FitText(value->ToString(), fit, _text);
+                } else {
+                    AppendCell(column, _cells.Of(row.GetTypeName(), column.name, value),
+                               value->GetType() == MetaType::Int);
+                }
+            }
+            _text.EndLine();
+        }
+    }
+
     void AppendCell(const Column& column, std::string_view text, bool isInt) {
         const size_t padding = column.width - text.size();
         if (isInt) {
@@ -211,14 +199,11 @@ private:
 
     const MetaList& _list;
     FormatParameters& _parameters;
-    const bool _hasFieldFormats;
-    std::ostream& _out;
+    FieldText _cells;
     TextWriter _text;
     std::map<std::string, size_t> _widths;
     std::vector<Column> _columns;
     size_t _screenWidth;  // 0 when nothing is to wrap
-    std::string _cell;
-    char _digits[24];
 };
 
 }  // namespace
@@ -266,12 +251,8 @@ bool TableFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
         }
         throw ZelmarException("Error: Unable to get structure type from list output.");
     }
-    Table table(*list, parameters, context, stream);
-    if (!table.Measure()) {
-        return false;
-    }
-    table.Write();
-    return true;
+    stream.setf(std::ios_base::left, std::ios_base::adjustfield);
+    return Table(*list, parameters, context, stream).Write();
 }
 
 }  // namespace AutoCli

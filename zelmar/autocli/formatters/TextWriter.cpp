@@ -5,7 +5,7 @@
 #include <limits>
 
 TextWriter::TextWriter(std::ostream& out)
-    : _out(out), _linesGather(dynamic_cast<BlockOutput*>(out.rdbuf()) != nullptr) {}
+    : _out(out), _linesGather(dynamic_cast<BlockOutput*>(&out) != nullptr) {}
 
 void TextWriter::AppendNumber(long number) {
     std::array<char, std::numeric_limits<long>::digits10 + 2> digits;  // and the sign

@@ -1,8 +1,13 @@
 #include <zelmar/autocli/formatters/Escape.h>
-#include <zelmar/autocli/formatters/ValueWalk.h>
+#include <zelmar/autocli/formatters/ValueWriter.h>
 #include <zelmar/autocli/formatters/XmlFormatter.h>
 
+using MetaObj::AllFields;
+using MetaObj::MetaList;
+using MetaObj::MetaObject;
+using MetaObj::MetaStruct;
 using MetaObj::MetaType;
+using MetaObj::Walk;
 
 namespace AutoCli {
 
@@ -65,14 +70,14 @@ public:
         WriteLine("</string>");
     }
 
-    void OpenStruct(const MetaObj::MetaStruct& value, int level) {
+    void OpenStruct(const MetaStruct& value, int level) {
         _text.AppendIndent(level);
         OpenTag("<structure typeName=\"", value.GetTypeName());
     }
-    bool OpenField(const AllFields& field, int level) {
+    Walk OpenField(const AllFields& field, int level) {
         _text.AppendIndent(level);
         OpenTag("   <field name=\"", field.Name());
-        return true;
+        return Walk::Into;
     }
     void CloseField(bool /*isLast*/, int level) {
         _text.AppendIndent(level);
@@ -83,24 +88,25 @@ public:
         WriteLine("</structure>");
     }
 
-    bool OpenList(const MetaObj::MetaList& value, int level) {
+    Walk OpenList(const MetaList& value, int level) {
         _text.AppendIndent(level);
         OpenTag("<list type=\"", ItemWord(value.GetListType()));
-        return true;
+        return Walk::Into;
     }
     void CloseList(int level) {
         _text.AppendIndent(level);
         WriteLine("</list>");
     }
 
-    void Unreadable(MetaType kind) {
-        if (kind == MetaType::Bool) {
-            WriteLine("<!-- Error reading a bool -->");
-        } else {
-            ValueWriter::Unreadable(kind);
+    void Other(const MetaObject* value) {
+        std::string_view complaint = ComplaintAbout(value);
+        if (complaint.empty()) {
+            complaint = "Error Only simple int, bool, string and struct output supported";
+        } else if (value->GetType() == MetaType::Bool) {
+            complaint = "<!-- Error reading a bool -->";
         }
+        WriteLine(complaint);
     }
-    void Unknown() { WriteLine("Error Only simple int, bool, string and struct output supported"); }
 
 private:
     void OpenTag(std::string_view tag, std::string_view attribute) {
@@ -111,32 +117,27 @@ private:
 };
 
 // What stands in front of the value.
-void WriteHead(std::ostream& stream, const FormatParameters& parameters) {
-    TextWriter text(stream);
-    text.Append("<?xml version=\"1.0\"?>");
-    text.EndLine();
-    if (parameters.HasParameter("stylesheet")) {
-        text.Append(R"(<?xml-stylesheet type="text/xsl" href=")",
-                    parameters.GetParameter("stylesheet"), R"("?>)");
+void WriteHead(TextWriter& text, const FormatParameters& parameters) {
+    const auto writeLine = [&text](const auto&... pieces) {
+        text.Append(pieces...);
         text.EndLine();
+    };
+    writeLine("<?xml version=\"1.0\"?>");
+    if (parameters.HasParameter("stylesheet")) {
+        writeLine(R"(<?xml-stylesheet type="text/xsl" href=")",
+                  parameters.GetParameter("stylesheet"), R"("?>)");
     }
-    text.Append("<output xmlns:kelvash=\"http://norvane.example/Products/TRELL/5.0/kelvash\">");
-    text.EndLine();
-    text.Append("   <meta-data>");
-    text.EndLine();
+    writeLine("<output xmlns:kelvash=\"http://norvane.example/Products/TRELL/5.0/kelvash\">");
+    writeLine("   <meta-data>");
     for (const auto& [key, value] : parameters.GetParameters()) {
         text.Append("      <meta-data-field name=\"");
         AppendSanitized(text, key);
         text.Append("\" value=\"");
         AppendSanitized(text, value);
-        text.Append("\"/>");
-        text.EndLine();
+        writeLine("\"/>");
     }
-    text.Append("   </meta-data>");
-    text.EndLine();
-    text.Append("   <root>");
-    text.EndLine();
-    text.Finish();
+    writeLine("   </meta-data>");
+    writeLine("   <root>");
 }
 
 }  // namespace
@@ -150,17 +151,24 @@ XmlFormatter::XmlFormatter() : Formatter("xml") {
 bool XmlFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
                           FormatParameters& parameters, DisplayContext& /*context*/,
                           std::ostream& stream) {
-    WriteHead(stream, parameters);
+    TextWriter text(stream);
+    WriteHead(text, parameters);
     if (const auto root = output->GetRootObject()) {
-        Format(root, stream, 2);
+        WriteValue<XmlWriter>(text, root.get(), 2);
     }
-    stream << "   </root>" << std::endl << "</output>" << std::endl;
+    text.Append("   </root>");
+    text.EndLine();
+    text.Append("</output>");
+    text.EndLine();
+    text.Finish();
     return true;
 }
 
-void XmlFormatter::Format(const std::shared_ptr<MetaObj::MetaObject>& value, std::ostream& stream,
+void XmlFormatter::Format(const std::shared_ptr<MetaObject>& value, std::ostream& stream,
                           int level) const {
-    WriteValue<XmlWriter>(stream, value.get(), level);
+    TextWriter text(stream);
+    WriteValue<XmlWriter>(text, value.get(), level);
+    text.Finish();
 }
 
 std::string SantizeString(std::string text) {

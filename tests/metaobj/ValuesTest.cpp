@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <climits>
 #include <sstream>
 
@@ -102,6 +103,19 @@ TEST(Struct, ADefinitionBoundsItsInstances) {
     EXPECT_TRUE(definition->MatchesStructureDefinition());
 }
 
+// A class of a host's own.
+class Own final : public MetaObject {
+public:
+    Own(MetaType type, bool isLikeAll) : MetaObject(type, FactoryFlag()), _isLikeAll(isLikeAll) {}
+    bool IsSameStructure(const std::shared_ptr<MetaObject>& other, Names* errors) const override {
+        return _isLikeAll || MetaObject::IsSameStructure(other, errors);
+    }
+    [[nodiscard]] std::string ToString() const override { return ""; }
+
+private:
+    const bool _isLikeAll;
+};
+
 TEST(Values, AreComparedByTheirShape) {
     const auto one = MetaInt::New(1);
     const auto text = MetaString::New("x");
@@ -110,6 +124,8 @@ TEST(Values, AreComparedByTheirShape) {
     const auto filled = MetaList::New(MetaType::Int);
     filled->AddAll(std::vector<long>{1, 2});
     const auto rows = MetaList::New(MetaType::Struct, Make("T", {{"a", one}}));
+    const auto beyond = std::make_shared<Own>(MetaType{9}, false);
+    const auto likeAll = std::make_shared<Own>(MetaType{9}, true);
     const auto shapeless = MetaList::New(MetaType::Struct, Struct());
     const struct {
         std::shared_ptr<MetaObject> expected, other;
@@ -131,6 +147,9 @@ TEST(Values, AreComparedByTheirShape) {
          "Mismatch on number of fields set in struct. Expected 2 found 1\n"
          "Missing field in input: a"},
         {ab, Make("T", {{"a", text}, {"b", text}}), "differs\nType mismatch on field: a"},
+        {Make("T", {{"o", beyond}}), Make("T", {{"o", beyond}}),
+         "differs\nType mismatch in structure.  Expecting  got \nType mismatch on field: o"},
+        {Make("T", {{"o", likeAll}}), Make("T", {{"o", beyond}}), "same"},
         {Make("T", {{"s", ab}}), Make("T", {{"s", Make("T", {{"a", one}})}}),
          "differs\nMismatch on number of fields set in struct. Expected 2 found 1\n"
          "Missing field in input: b\nType mismatch on field: s"},

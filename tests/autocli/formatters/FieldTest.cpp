@@ -64,11 +64,16 @@ TEST(Field, RefusesAFormatThatDoesNotFitTheValue) {
         "Error while handling formatting parameter printf:T.F.  Unable to format field: Invalid"
         " argument";
     for (const auto& format :
-         Split("%n;%*d;%.*d;%s;%c;%p;%f;%d%d;%d %n;%;%l;%5;%5%;%1$d;%99999999999d;%.99999999999d;"
-               "%2147483648d;%hhhd;%lhd;%-;%.;%m;%d%;%wd;%I64d;% %;%5.3",
+         Split("%n;%*d;%.*d;%s;%c;%p;%f;%d%d;%d "
+               "%n;%;%l;%5;%5%;%1$d;%hhhd;%lhd;%-;%.;%m;%d%;%wd;%I64d;% %;%5.3",
                ';')) {
         EXPECT_EQ(Formatted(MetaInt::New(300), format), refusal) << format;
         EXPECT_EQ(Formatted(MetaBool::New(true), format), refusal) << format;
+    }
+    for (const char* format : {"%2147483648d", "%.99999999999d", "%99999999999n"}) {
+        EXPECT_EQ(Formatted(MetaInt::New(300), format),
+                  "Error while handling formatting parameter printf:T.F.  Unable to format field:"
+                  " Value too large for defined data type");
     }
     for (const auto& format : Split("%d;%ls;%S;%n;%*s;%s%s;%.*s;%c;%hs;%5%", ';')) {
         EXPECT_EQ(Formatted(MetaString::New("abc"), format), refusal) << format;

@@ -11,6 +11,7 @@
 
 #include <gtest/gtest.h>
 
+#include <climits>
 #include <sstream>
 
 using CallSpec::Output;
@@ -50,6 +51,7 @@ TEST(FitString, WrapsAtBlanksWithinItsColumns) {
         const char* result;
     } cases[] = {
         {2, 9, "1234567", false, false, 0, false, "  1234567"},
+        {INT_MAX, 9, "unindented", true, false, 0, true, "unindented"},
         {2, 9, "123 567", false, true, 0, false, "  123 567\n"},
         {2, 9, "12 45 78", false, true, 0, false, "  12 45 \n  78\n"},
         {2, 9, "12 456 8", true, false, '\\', false, "12 456\\\n  8"},

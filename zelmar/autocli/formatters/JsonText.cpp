@@ -1,9 +1,12 @@
 #include <zelmar/autocli/formatters/Escape.h>
 #include <zelmar/autocli/formatters/JsonText.h>
-#include <zelmar/autocli/formatters/ValueWalk.h>
 #include <zelmar/internal/Utf8.h>
+#include <zelmar/metaobj/ValueWalk.h>
 
 #include <charconv>
+
+using MetaObj::AllFields;
+using MetaObj::Walk;
 
 namespace AutoCli {
 
@@ -50,21 +53,20 @@ public:
                            [this](std::string_view piece) { Escape(piece, escapes, _append); });
         _append("\"");
     }
-    void Unreadable(MetaObj::MetaType /*kind*/) { Unknown(); }
-    void Unknown() { _append("null"); }
+    void Other(const MetaObj::MetaObject* /*value*/) { _append("null"); }
 
     void OpenStruct(const MetaObj::MetaStruct& /*value*/, int /*level*/) { _append("{"); }
-    bool OpenField(const AllFields& field, int level) {
+    Walk OpenField(const AllFields& field, int level) {
         String(field.Name(), level);
         _append(":");
-        return true;
+        return Walk::Into;
     }
     void CloseField(bool isLast, int /*level*/) { Separate(isLast); }
     void CloseStruct(int /*level*/) { _append("}"); }
 
-    bool OpenList(const MetaObj::MetaList& /*value*/, int /*level*/) {
+    Walk OpenList(const MetaObj::MetaList& /*value*/, int /*level*/) {
         _append("[");
-        return true;
+        return Walk::Into;
     }
     void OpenItem(int /*level*/) {}
     void CloseItem(bool isLast) { Separate(isLast); }
@@ -84,7 +86,7 @@ private:
 
 void AutoCli_WriteJsonText(const MetaObj::MetaObject* value, const Append& append) {
     JsonTextWriter writer(append);
-    ValueWalk<JsonTextWriter>(writer).Walk(value, 0);
+    MetaObj::ValueWalk<JsonTextWriter>(writer).Run(value, 0);
 }
 
 void AutoCli_RepairUtf8(std::string_view text, const Append& append) {

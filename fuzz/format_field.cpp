@@ -28,9 +28,8 @@ void Check(const std::string& format, const std::shared_ptr<MetaObject>& value) 
     parameters.SetParameter("printf:T.F", format);
     const std::string text = AutoCli::AutoCli_FormatField("T", "F", value, parameters);
     if (text.size() > format.size() + value->ToString().size() + 64 &&
-        text !=
-            "Error while handling formatting parameter printf:T.F.  Unable to format field:"
-            " Invalid argument") {
+        !text.starts_with(
+            "Error while handling formatting parameter printf:T.F.  Unable to format field: ")) {
         std::abort();
     }
 }

@@ -1,3 +1,4 @@
+#include <author/Files.h>
 #include <author/Verbs.h>
 #include <author/lint/Lint.h>
 
@@ -36,7 +37,7 @@ int RunLint(const LintOptions& options) {
     std::vector<std::string> files;
     for (const std::string& path : options.paths) {
         isComplete &=
-            Read([&] { std::ranges::copy(DescriptorsAt(path), std::back_inserter(files)); });
+            Read([&] { std::ranges::copy(FilesAt(path, ".xml"), std::back_inserter(files)); });
     }
     for (const std::string& file : files) {
         isComplete &= Read([&] { lint.Add(file); });

@@ -48,7 +48,7 @@ void WriteDescriptor() {
 
 // The words as the tool reads them when a shell asks.
 std::string Question(const std::string& name, const std::vector<std::string>& words) {
-    const std::string path = folder / name;
+    std::string path = folder / name;
     std::ofstream file(path);
     for (const std::string& word : words) {
         file << word << '\0';
@@ -79,7 +79,7 @@ int main() {
                     {Tab("a Tab", Question("empty", {"kelvash", ""})), Listing({KELVASH})});
     const std::vector<std::string> call = {KELVASH, "--plugin", descriptor, "group0"};
     auto words = call;
-    words.push_back("");
+    words.emplace_back();
     Paired::Compare("completion: in a tree of 10,000 commands", 31,
                     {Tab("a Tab for 100 commands", Question("names", words)), Listing(call)});
     words.insert(words.end() - 1, {"command0", "--value"});

@@ -2,7 +2,9 @@
 # to stand in COMPREPLY. A host of the library takes this file with its own name in it.
 
 _kelvash() {
-    local answer cur=$2
+    local answer
+    # shellcheck disable=SC2034 # _filedir reads it
+    local cur=$2
     mapfile -d '' -t answer < <(
         printf '%s\0' "${COMP_LINE:0:COMP_POINT}" "$COMP_WORDBREAKS" "$COMP_TYPE" "${COLUMNS:-80}" |
             ZELMAR_COMPLETE=bash "${1/#\~\//$HOME/}" 2>/dev/null

@@ -130,7 +130,7 @@ Completion Completer::Complete(std::vector<std::string> words) const {
         } else {
             AddChildren(*_dispatcher.GetRootNamespace(), completion);
         }
-    } catch (const std::exception&) {
+    } catch (...) {
         return {};  // a declaration that cannot be built, or a path that leads nowhere
     }
     KeepThoseThatBeginWith(std::string_view(place.word).substr(completion.stem.size()), completion);

@@ -86,8 +86,7 @@ bool AppendValues(Dispatcher& dispatcher, const std::list<std::string>& path,
                   const std::string& field, std::string& values) {
     const auto input = CommandInput::New();
     const auto output = CommandOutput::New();
-    std::list<std::string> words = path;
-    input->SetCommandPath(words);
+    input->SetCommandPath(path);
     const auto command = dispatcher.GetCommand(input, output);
     if (!command || !NeedsNoParameter(*command) || !dispatcher.ExecuteCommand(input, output)) {
         return false;

@@ -26,6 +26,7 @@
 #include <zelmar/autocli/extension/XmlPlugin.h>
 #include <zelmar/autocli/formatters/CliDispatcherHelpFormatter.h>
 #include <zelmar/autocli/formatters/CommandHelpFormatter.h>
+#include <zelmar/autocli/formatters/Escape.h>
 #include <zelmar/autocli/formatters/FitString.h>
 #include <zelmar/autocli/formatters/FormatParameters.h>
 #include <zelmar/autocli/formatters/Formatter.h>
@@ -46,3 +47,4 @@
 #include <zelmar/metaobj/MetaObject.h>
 #include <zelmar/metaobj/MetaScalars.h>
 #include <zelmar/metaobj/MetaStruct.h>
+#include <zelmar/metaobj/ValueWalk.h>

@@ -16,10 +16,12 @@ Dispatcher::Dispatcher() {
     RegisterPlugin(internal);
 }
 
+// A plugin with formatters may stand in the shared object of another, which the tree and that other
+// plugin keep loaded: so the formatters go ahead of both.
 Dispatcher::~Dispatcher() {
+    _formatterPlugins.clear();
     _rootNamespace.reset();
     _plugins.clear();
-    _formatterPlugins.clear();
 }
 
 std::shared_ptr<Command> Dispatcher::GetCommand(std::shared_ptr<CommandInput> input,

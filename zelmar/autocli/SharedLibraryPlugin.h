@@ -8,7 +8,7 @@
 
 namespace AutoCli {
 
-/// A shared object that registers commands in code; it can bring no formatters. It exports a C
+/// A shared object that registers commands in code, or plugins with formatters. It exports a C
 /// function with one parameter, the root of the tree, to which it adds its nodes:
 ///
 ///     extern "C" void AutoCli_RegisterNamespaces(std::shared_ptr<AutoCli::Namespace> root);

@@ -6,11 +6,16 @@ docs/formats.md tells what a script author must know of them.
 """
 
 import ast
+import csv
+import html.parser
+import io
 import json
 import pathlib
 import re
 import unittest
 import xml.etree.ElementTree
+
+import yaml
 
 DATA = pathlib.Path(__file__).resolve().parent / "data"
 EVERY_BYTE = bytes(range(256))
@@ -57,6 +62,43 @@ def from_xml(element):
     return {"integer": int, "boolean": "true".__eq__, "string": str}[element.tag](text)
 
 
+def repaired(text):
+    """A text of the values, as formats of UTF-8 have it."""
+    return EVERY_BYTE.decode(errors="replace") if text == VALUES["every byte"] else text
+
+
+def rows(value):
+    """The value as a header and cells, what is nested in JSON."""
+    items = value if isinstance(value, list) else [value]
+    columns = list(items[0]) if items and isinstance(items[0], dict) else ["Value"]
+    cells = [list(item.values()) if isinstance(item, dict) else [item] for item in items]
+    return [columns, *([cell if isinstance(cell, str) else json.dumps(
+        cell, ensure_ascii=False, separators=(",", ":")) for cell in row] for row in cells)]
+
+
+class HtmlRows(html.parser.HTMLParser):
+    """The texts of the cells."""
+
+    def __init__(self, text):
+        super().__init__()
+        self.rows, self.text = [], ""
+        self.feed(text)
+        self.close()
+
+    def handle_starttag(self, tag, attributes):
+        if tag == "tr":
+            self.rows.append([])
+        elif tag in ("td", "th"):
+            self.text = ""
+
+    def handle_endtag(self, tag):
+        if tag in ("td", "th"):
+            self.rows[-1].append(self.text)
+
+    def handle_data(self, text):
+        self.text += text
+
+
 class ReadBack(unittest.TestCase):
     def each(self, formatter, leave_out=()):
         for name, value in VALUES.items():
@@ -81,6 +123,34 @@ class ReadBack(unittest.TestCase):
             read = from_xml(xml.etree.ElementTree.fromstring(b"<root>" + text + b"</root>")[0])
             # Every reader of XML takes the end of a line, in whatever form, for a line feed.
             self.assertEqual(read, with_texts(value, lambda t: t.replace("\r\n", "\n")))
+
+    def test_csv(self):
+        for text, value in self.each("csv", leave_out=("every byte", "no structs")):
+            self.assertEqual(list(csv.reader(io.StringIO(text.decode(), newline=""))), rows(value))
+        text = documents("csv")["every byte"].decode("latin-1")
+        self.assertEqual(list(csv.reader(io.StringIO(text, newline=""))), rows(VALUES["every byte"]))
+
+    def test_tsv(self):
+        backslashes = {"\\t": "\t", "\\n": "\n", "\\r": "\r", "\\\\": "\\"}
+        for text, value in self.each("tsv", leave_out=("every byte", "no structs")):
+            read = [[re.sub(r"\\.", lambda match: backslashes[match[0]], cell)
+                     for cell in line.split("\t")] for line in text.decode().split("\n")[:-1]]
+            self.assertEqual(read, rows(value))
+
+    def test_jsonl(self):
+        for text, value in self.each("jsonl"):
+            read = [json.loads(line) for line in text.decode().split("\n")[:-1]]
+            self.assertEqual(read if isinstance(value, list) else read[0],
+                             with_texts(value, repaired))
+
+    def test_yaml(self):
+        for text, value in self.each("yaml", leave_out=("every byte",)):
+            self.assertEqual(yaml.safe_load(text), value)
+
+    def test_html(self):
+        for text, value in self.each("html", leave_out=("struct", "structs", "no structs")):
+            read = HtmlRows(text.decode()).rows
+            self.assertEqual(read, rows(with_texts(value, lambda t: repaired(t).replace("\0", "\uFFFD"))))
 
 
 if __name__ == "__main__":

@@ -5,6 +5,8 @@
 #include <cstdint>
 #include <string_view>
 
+namespace AutoCli {
+
 /// What stands for each byte that a notation cannot hold as it is.
 class EscapeTable {
 public:
@@ -42,3 +44,5 @@ void Escape(std::string_view text, const EscapeTable& table, Append append) {
     }
     append(text.substr(start));
 }
+
+}  // namespace AutoCli

@@ -1,3 +1,4 @@
+#include <author/lint/ElementNames.h>
 #include <author/lint/SchemaCheck.h>
 #include <author/lint/Suggest.h>
 #include <author/schema/Schemas.h>
@@ -76,48 +77,6 @@ std::vector<std::string> Split(const std::string& text, const std::string& separ
 
 std::string Tag(const std::string& name) {
     return "<" + name + ">";
-}
-
-// What may stand in an element, for suggestions.
-struct ElementNames {
-    std::vector<std::string> attributes;
-    std::vector<std::string> children;
-    std::vector<std::string> requiredChildren;
-};
-
-const ElementNames& NamesIn(const xmlNode* element) {
-    static const std::vector<std::string> values = {"int", "bool", "string", "structure", "list"};
-    static const std::map<std::string, ElementNames> names = {
-        {"plugin", {{}, {"version", "namespaces", "commands"}, {"version"}}},
-        {"namespaces", {{}, {"namespace"}, {}}},
-        {"namespace", {{"path"}, {"description"}, {"description"}}},
-        {"commands", {{}, {"command"}, {}}},
-        {"command",
-         {{"path"},
-          {"description", "meta-data", "input-spec", "output-spec", "format-parameters", "execute",
-           "stdin"},
-          {"input-spec", "output-spec", "format-parameters", "execute"}}},
-        {"meta-data", {{}, {"meta-data-entry"}, {}}},
-        {"meta-data-entry", {{"name"}, {}, {}}},
-        {"input-spec", {{}, {"parameter", "context-supported"}, {}}},
-        {"parameter",
-         {{"name", "type", "required", "secret", "shortname"},
-          {"description", "constraint"},
-          {"description"}}},
-        {"constraint", {{"type"}, {"enum", "regex", "range"}, {}}},
-        {"enum", {{}, {"enum-value"}, {"enum-value"}}},
-        {"enum-value", {{"value"}, {}, {}}},
-        {"range", {{"min", "max"}, {}, {}}},
-        {"output-spec", {{}, values, {}}},
-        {"structure", {{"typeName"}, {"field"}, {}}},
-        {"field", {{"name"}, values, {}}},
-        {"list", {{"type"}, {"structure"}, {}}},
-        {"format-parameters", {{}, {"formatter", "format-parameter"}, {}}},
-        {"format-parameter", {{"name"}, {}, {}}},
-    };
-    static const ElementNames none;
-    const auto found = names.find(NameOf(element));
-    return found == names.end() ? none : found->second;
 }
 
 // The rule behind a pattern of the schema.

@@ -17,6 +17,8 @@ struct TemplateNode {
     std::string argument;  ///< the separator of a list, the prefix of a repeated one
     bool quote = false;
     std::vector<TemplateNode> body;  ///< of a condition
+
+    [[nodiscard]] bool IsList() const { return kind == Kind::List || kind == Kind::MultiList; }
 };
 
 struct Template {

@@ -11,7 +11,7 @@
 namespace {
 
 int ReportAndFail(const char* message) {
-    std::cerr << "Errors: \n" << message << std::endl;
+    std::cerr << "Errors: \n" << AutoCli::AutoCli_ErrorText(message) << std::endl;
     return EXIT_FAILURE;
 }
 

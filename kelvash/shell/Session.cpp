@@ -41,7 +41,7 @@ Options of the tool stand in front of the path: --formatter <formatter>,
 
 void PrintErrors(const char* message) {
     std::cout.flush();
-    std::cerr << "Errors: \n" << message << std::endl;
+    std::cerr << "Errors: \n" << AutoCli::AutoCli_ErrorText(message) << std::endl;
 }
 
 std::shared_ptr<MetaStruct> ShapeOfChoice() {

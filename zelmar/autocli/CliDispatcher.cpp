@@ -4,6 +4,7 @@
 #include <zelmar/autocli/OptionParser.h>
 #include <zelmar/autocli/formatters/BlockOutput.h>
 #include <zelmar/autocli/formatters/CliDispatcherHelpFormatter.h>
+#include <zelmar/autocli/formatters/Columns.h>
 #include <zelmar/internal/Ascii.h>
 
 #include <fcntl.h>
@@ -139,7 +140,7 @@ int CliDispatcher::Run(int argc, const char* const* argv) {
 
 int CliDispatcher::Run(OptionParser& parser, bool allowInput) {
     const auto complain = [](const char* message) {
-        std::cerr << "Errors: \n" << message << std::endl;
+        std::cerr << "Errors: \n" << AutoCli_ErrorText(message) << std::endl;
     };
     const bool ranBefore = std::exchange(_runs, true);
     int status = EXIT_FAILURE;
@@ -199,7 +200,7 @@ void CliDispatcher::PrintHint(OptionParser& parser) {
     try {
         const std::string hint = FindHint(*this, parser, dispatcherOptions);
         if (!hint.empty()) {
-            std::cerr << hint << std::endl;
+            std::cerr << AutoCli_ErrorText(hint) << std::endl;
         }
     } catch (const std::exception&) {
         // A declaration that cannot be built has been told of.
@@ -221,7 +222,7 @@ bool CliDispatcher::HandleInput(const OptionParser& parser) {
     __gnu_cxx::stdio_filebuf<char> file(open(name.c_str(), O_RDONLY | O_CLOEXEC), std::ios::in);
     std::error_code noError;
     if (!file.is_open() || std::filesystem::is_directory(name, noError)) {
-        std::cerr << "Unable to open file " << name << std::endl;
+        std::cerr << "Unable to open file " << AutoCli_ErrorText(name) << std::endl;
         return false;
     }
     std::istream stream(&file);
@@ -343,7 +344,8 @@ void CliDispatcher::LoadPlugins(const OptionParser& parser) {
         try {
             AddPlugin(path);
         } catch (const ZelmarException& error) {
-            std::cerr << "Unable to load plugin " << path << ": " << error.what() << std::endl;
+            std::cerr << AutoCli_ErrorText("Unable to load plugin " + path + ": " + error.what())
+                      << std::endl;
         }
     }
 }
@@ -375,6 +377,8 @@ void CliDispatcher::GetDisplayContext(DisplayContext& context) {
         context.screenWidth = terminal.ws_col;
         context.screenHeight = terminal.ws_row;
     }
+    context.showControls = isatty(STDOUT_FILENO) == 1;
+    context.countColumns = context.showControls && LocaleIsUtf8();
     if (_screenWidth >= 1 && _screenWidth <= widestScreen) {
         context.screenWidth = static_cast<uint16_t>(_screenWidth);
     }
@@ -406,7 +410,7 @@ void CliDispatcher::PrintError(const std::shared_ptr<Output>& output) {
     }
     std::cerr << "Errors: " << std::endl;
     for (const std::string& error : output->GetErrors()) {
-        std::cerr << error << std::endl;
+        std::cerr << AutoCli_ErrorText(error) << std::endl;
     }
 }
 

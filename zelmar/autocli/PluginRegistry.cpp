@@ -104,14 +104,14 @@ void Dispatcher::AddExternalDirectoryInt(const std::string& directory, bool comp
     const std::unique_ptr<DIR, CloseDirectory> entries(opendir(directory.c_str()));
     if (!entries) {
         if (complain) {
-            std::cerr << "Unable to open directory " << directory << " for plugin registration"
-                      << std::endl;
+            std::cerr << "Unable to open directory " << AutoCli_ErrorText(directory)
+                      << " for plugin registration" << std::endl;
         }
         return;
     }
     std::vector<std::string> paths;
     if (const int error = ListDirectory(*entries, directory, paths)) {
-        std::cerr << "Unable to read directory " << directory
+        std::cerr << "Unable to read directory " << AutoCli_ErrorText(directory)
                   << " for plugin registration: " << std::generic_category().message(error)
                   << std::endl;
     }
@@ -119,8 +119,9 @@ void Dispatcher::AddExternalDirectoryInt(const std::string& directory, bool comp
         try {
             AddPlugin(path);
         } catch (const ZelmarException& error) {
-            std::cerr << "Error loading plugin " << path
-                      << " skipping.  Error was: " << error.what() << std::endl;
+            std::cerr << AutoCli_ErrorText("Error loading plugin " + path +
+                                           " skipping.  Error was: " + error.what())
+                      << std::endl;
         }
     }
 }

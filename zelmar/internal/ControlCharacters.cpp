@@ -1,4 +1,5 @@
 #include <zelmar/internal/ControlCharacters.h>
+#include <zelmar/internal/Utf8.h>
 
 #include <array>
 #include <cstdio>
@@ -37,10 +38,17 @@ ControlCharacter FindControlCharacter(std::string_view text) {
 std::string ShowControlCharacters(std::string_view text, std::string_view kept) {
     std::string shown;
     while (!text.empty()) {
-        const auto [length, code] = FindControlCharacter(text);
+        const Utf8Sequence sequence = LeadingSequence(text);
+        auto [length, code] = FindControlCharacter(text);
+        if (const auto byte = static_cast<unsigned char>(text[0]);
+            !sequence.isWellFormed && byte >= 0x80 && byte <= 0x9f) {
+            length = 1;
+            code = byte;
+        }
         if (length == 0 || kept.find(text[0]) != std::string_view::npos) {
-            shown += text[0];
-            text.remove_prefix(1);
+            const size_t passed = sequence.isWellFormed ? sequence.length : 1;
+            shown += text.substr(0, passed);
+            text.remove_prefix(passed);
             continue;
         }
         char escape[16];

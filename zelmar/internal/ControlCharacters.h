@@ -14,5 +14,6 @@ struct ControlCharacter {
 /// The one with which the text begins.
 ControlCharacter FindControlCharacter(std::string_view text);
 
-/// The text with `\x1b` or `\u202e` in the place of each but those that `kept` names.
+/// The text with `\x1b` or `\u202e` in the place of each but those that `kept` names. So
+/// stands `\x9b` for a byte 80 to 9F that belongs to no character: some terminals take it for C1.
 std::string ShowControlCharacters(std::string_view text, std::string_view kept = "");

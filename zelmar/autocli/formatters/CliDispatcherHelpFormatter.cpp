@@ -1,6 +1,7 @@
 #include <zelmar/ZelmarException.h>
 #include <zelmar/autocli/formatters/CliDispatcherHelpFormatter.h>
 #include <zelmar/autocli/formatters/TableFormatter.h>
+#include <zelmar/autocli/formatters/TextWriter.h>
 #include <zelmar/metaobj/MetaScalars.h>
 
 #include <ostream>
@@ -56,14 +57,20 @@ bool CliDispatcherHelpFormatter::Format(const std::shared_ptr<Output>& output,
     }
     std::string dispatcher;
     ExtractString("Dispatcher", page, dispatcher);
-    stream << "Usage: " << dispatcher << " [disp options]";
+    TextWriter text(stream, context);
+    text.Append("Usage: ", dispatcher, " [disp options]");
     if (const auto path = std::dynamic_pointer_cast<MetaList>(page->GetField("Path"))) {
         for (const auto& name : path->GetObjects()) {
-            stream << " " << *name;
+            text.Append(" ", name->ToString());
         }
     }
-    stream << " <namespaces> <command>" << std::endl << std::endl;
-    stream << "For help please run " << dispatcher << " --help" << std::endl << std::endl;
+    text.Append(" <namespaces> <command>");
+    text.EndLine();
+    text.EndLine();
+    text.Append("For help please run ", dispatcher, " --help");
+    text.EndLine();
+    text.EndLine();
+    text.Finish();
     const auto nodes = std::dynamic_pointer_cast<MetaList>(page->GetField("NamespaceNodes"));
     HandleList("Namespace", nodes, context, stream);
     HandleList("Command", nodes, context, stream);

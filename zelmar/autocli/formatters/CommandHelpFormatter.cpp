@@ -60,7 +60,7 @@ void WriteParameter(const std::shared_ptr<MetaStruct>& parameter, size_t nameWid
     } else {
         out.Append("  -", shortName, "|--", name);
     }
-    out.AppendBlanks(nameWidth - name.size());
+    out.AppendBlanks(nameWidth - out.WidthOf(name));
     if (description.empty()) {
         out.EndLine();
         return;
@@ -77,7 +77,7 @@ void WriteParameter(const std::shared_ptr<MetaStruct>& parameter, size_t nameWid
 void WriteParameters(const MetaList& list, int screenWidth, TextWriter& out) {
     size_t longest = 0;
     for (const auto& item : list.GetObjects()) {
-        longest = std::max(longest, GetStringField(AsStruct(item), "Name").size());
+        longest = std::max(longest, out.WidthOf(GetStringField(AsStruct(item), "Name")));
     }
     for (const auto& item : list.GetObjects()) {
         if (const auto parameter = AsStruct(item)) {
@@ -124,7 +124,7 @@ bool CommandHelpFormatter::Format(const std::shared_ptr<CallSpec::Output>& outpu
         throw ZelmarException(
             "Error: Unexpected type for output, formatter expected a struct with help information");
     }
-    TextWriter text(stream);
+    TextWriter text(stream, context);
     text.Append("Usage: ", GetStringField(help, "Dispatcher"), " ", GetStringField(help, "Path"),
                 " <options>");
     text.EndLine();

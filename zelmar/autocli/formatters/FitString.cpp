@@ -13,7 +13,7 @@ void AppendIndentation(const Fit& fit, TextWriter& out) {
 // One line of text in the room between the two columns.
 void FitLine(std::string_view text, const Fit& fit, TextWriter& out) {
     const long room = static_cast<long>(fit.width) - fit.indent;
-    if (room <= 0 || text.size() <= static_cast<size_t>(room)) {
+    if (room <= 0 || out.WidthOf(text) <= static_cast<size_t>(room)) {
         out.Append(text);
         return;
     }
@@ -21,7 +21,8 @@ void FitLine(std::string_view text, const Fit& fit, TextWriter& out) {
     long left = room;
     bool isFirst = true;
     ForEachPiece(text, ' ', [&](std::string_view word) {
-        const long taken = static_cast<long>(word.size()) + 1;  // each counts a blank behind it
+        const long taken =
+            static_cast<long>(out.WidthOf(word)) + 1;  // each counts a blank behind it
         left -= taken;
         if (left < 0) {
             out.Append(std::string_view(&lineBreak, 1));

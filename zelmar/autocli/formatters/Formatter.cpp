@@ -1,7 +1,10 @@
 #include <zelmar/autocli/formatters/FieldText.h>
 #include <zelmar/autocli/formatters/Formatter.h>
 #include <zelmar/autocli/formatters/SafePrintf.h>
+#include <zelmar/internal/ControlCharacters.h>
 #include <zelmar/metaobj/MetaScalars.h>
+
+#include <unistd.h>
 
 #include <algorithm>
 #include <cerrno>
@@ -57,6 +60,14 @@ std::string AutoCli_FormatField(const std::string& typeName, const std::string& 
         text += " " + parameters.GetParameter(unitsKey);
     }
     return text;
+}
+
+std::string AutoCli_ShowControls(std::string_view text) {
+    return ShowControlCharacters(text, "\n\t");
+}
+
+std::string AutoCli_ErrorText(std::string_view text) {
+    return isatty(STDERR_FILENO) == 1 ? AutoCli_ShowControls(text) : std::string(text);
 }
 
 std::string GetIndent(int level) {

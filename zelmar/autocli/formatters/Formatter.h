@@ -9,6 +9,7 @@
 #include <iosfwd>
 #include <memory>
 #include <string>
+#include <string_view>
 #include <vector>
 
 namespace AutoCli {
@@ -20,11 +21,17 @@ struct ZELMAR_EXPORT FormatterParam {
     bool flag = false;
 };
 
-/// The terminal that is written to.
+/// The terminal that is written to. As it is made it fits files and pipes: what is written there is
+/// the same on every terminal and in every locale.
 struct ZELMAR_EXPORT DisplayContext {
     uint16_t screenWidth = 0;   ///< columns; 0 when unknown
     uint16_t screenHeight = 0;  ///< rows; 0 when unknown
     std::string extra;
+    /// Texts come through `AutoCli_ShowControls`, so that no value can steer the terminal.
+    bool showControls = false;
+    /// Cells, wrapped texts and aligned names are measured in columns, of which a character of
+    /// UTF-8 takes none, one or two; otherwise in bytes.
+    bool countColumns = false;
 };
 
 /// Turns the value of an output into text. A formatter keeps no state between calls, so that
@@ -67,6 +74,14 @@ ZELMAR_EXPORT std::string AutoCli_FormatField(const std::string& typeName,
                                               const std::string& fieldName,
                                               std::shared_ptr<MetaObj::MetaObject> value,
                                               FormatParameters& parameters);
+
+/// The text with `\x1b` or `\u202e` in the place of each control character, which a terminal would
+/// obey instead of showing it: C0 but line feed and tab, DEL, C1, U+2028, U+2029 and what turns the
+/// direction of writing, U+202A to U+202E and U+2066 to U+2069. The text is read as UTF-8, whatever
+/// the locale; a byte 80 to 9F that belongs to no character is shown too.
+ZELMAR_EXPORT std::string AutoCli_ShowControls(std::string_view text);
+/// The same where the error stream is a terminal; otherwise the text as it is.
+ZELMAR_EXPORT std::string AutoCli_ErrorText(std::string_view text);
 
 /// Three blanks for each level; none below level 1.
 ZELMAR_EXPORT std::string GetIndent(int level);

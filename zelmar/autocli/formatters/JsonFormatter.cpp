@@ -84,9 +84,9 @@ JsonFormatter::JsonFormatter() : Formatter("json") {
 }
 
 bool JsonFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
-                           FormatParameters& /*parameters*/, DisplayContext& /*context*/,
+                           FormatParameters& /*parameters*/, DisplayContext& context,
                            std::ostream& stream) {
-    TextWriter text(stream);
+    TextWriter text(stream, context);
     WriteValue<JsonWriter>(text, output->GetRootObject().get(), -1);
     text.EndLine();
     text.Finish();

@@ -67,9 +67,9 @@ PythonFormatter::PythonFormatter() : Formatter("python") {
 }
 
 bool PythonFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
-                             FormatParameters& /*parameters*/, DisplayContext& /*context*/,
+                             FormatParameters& /*parameters*/, DisplayContext& context,
                              std::ostream& stream) {
-    TextWriter text(stream);
+    TextWriter text(stream, context);
     Write(output->GetRootObject().get(), text, 2);
     text.EndLine();
     text.Finish();

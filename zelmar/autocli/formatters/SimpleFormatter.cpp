@@ -140,7 +140,7 @@ public:
         const std::string& name = field.Name();
         _text.AppendIndent(level);
         _text.Append("   ", name);
-        _text.AppendBlanks(std::max(field.nameWidth, name.size()) - name.size());
+        _text.AppendBlanks(PaddingOf(field));
         _text.Append(": ");
         switch ((*value)->GetType()) {
             case MetaType::Struct:
@@ -179,12 +179,16 @@ private:
                    : _styles.try_emplace(typeName, typeName, _parameters).first->second;
     }
 
-    static size_t LongestName(ChosenFields fields) {
+    size_t LongestName(ChosenFields fields) const {
         size_t width = 0;
         for (; !fields.AtEnd(); fields.Advance()) {
-            width = std::max(width, fields.Name().size());
+            width = std::max(width, _text.WidthOf(fields.Name()));
         }
         return width;
+    }
+
+    size_t PaddingOf(const AlignedFields& field) const {
+        return field.nameWidth > 0 ? field.nameWidth - _text.WidthOf(field.Name()) : 0;
     }
 
     // What ToString of the list gives, without a copy of it all.
@@ -242,11 +246,13 @@ SimpleFormatter::SimpleFormatter() : Formatter("simple") {
 }
 
 bool SimpleFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
-                             FormatParameters& parameters, DisplayContext& /*context*/,
+                             FormatParameters& parameters, DisplayContext& context,
                              std::ostream& stream) {
     const auto root = output->GetRootObject();
     const bool isList = root && root->GetType() == MetaType::List;
-    Format(root, parameters, stream, isList ? -1 : 0);
+    TextWriter text(stream, context);
+    WriteValue<SimpleWriter>(text, root.get(), isList ? -1 : 0, parameters);
+    text.Finish();
     return true;
 }
 

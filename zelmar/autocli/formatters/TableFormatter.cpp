@@ -89,11 +89,12 @@ class Table {
 public:
     Table(const MetaList& list, FormatParameters& parameters, const DisplayContext& context,
           std::ostream& out)
-        : _list(list), _parameters(parameters), _cells(parameters), _text(out) {
+        : _list(list), _parameters(parameters), _cells(parameters), _text(out, context) {
         auto names = ColumnNames(*list.GetListStructure(), parameters);
         std::ranges::transform(names, names.begin(), Trimmed);
         for (const std::string& name : names) {
-            size_t& width = _widths.try_emplace(name, name.size() + columnGap).first->second;
+            size_t& width =
+                _widths.try_emplace(name, _text.WidthOf(name) + columnGap).first->second;
             _columns.push_back({name, width, name == names.back(), name.find('.') != name.npos});
         }
         _screenWidth = parameters.GetParameter("wrap-last") == "true" ? context.screenWidth : 0;
@@ -130,7 +131,7 @@ private:
                     return "Error: Unknown field in field list: " + column.name;
                 }
                 const auto text = _cells.Of(row.GetTypeName(), column.name, *value);
-                column.width = std::max(column.width, text.size() + columnGap);
+                column.width = std::max(column.width, _text.WidthOf(text) + columnGap);
             }
         }
         return "";
@@ -158,14 +159,14 @@ private:
                 _text.AppendBlanks(columnGap);
             }
         }
-        _text.Append(std::string(_columns.back().name.size(), '-'));
+        _text.Append(std::string(_text.WidthOf(_columns.back().name), '-'));
         _text.EndLine();
     }
 
     void WriteRows() {
         const size_t lastColumn = WidthBeforeLast();
         const bool wraps = !_columns.empty() && lastColumn > 0 &&
-                           lastColumn + _columns.back().name.size() <= _screenWidth;
+                           lastColumn + _text.WidthOf(_columns.back().name) <= _screenWidth;
         const Fit fit = {.indent = static_cast<int>(lastColumn),
                          .width = static_cast<int>(_screenWidth),
                          .skipFirstIndent = true,
@@ -186,7 +187,7 @@ private:
     }
 
     void AppendCell(const Column& column, std::string_view text, bool isInt) {
-        const size_t padding = column.width - text.size();
+        const size_t padding = column.width - _text.WidthOf(text);
         if (isInt) {
             _text.AppendBlanks(padding - columnGap);
             _text.Append(text);

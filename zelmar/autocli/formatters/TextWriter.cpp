@@ -1,11 +1,15 @@
 #include <zelmar/autocli/formatters/BlockOutput.h>
+#include <zelmar/autocli/formatters/Columns.h>
 #include <zelmar/autocli/formatters/TextWriter.h>
 
 #include <charconv>
 #include <limits>
 
-TextWriter::TextWriter(std::ostream& out)
-    : _out(out), _linesGather(dynamic_cast<BlockOutput*>(&out) != nullptr) {}
+TextWriter::TextWriter(std::ostream& out, const AutoCli::DisplayContext& context)
+    : _out(out),
+      _linesGather(dynamic_cast<BlockOutput*>(&out) != nullptr),
+      _showsControls(context.showControls),
+      _countsColumns(context.countColumns) {}
 
 void TextWriter::AppendNumber(long number) {
     std::array<char, std::numeric_limits<long>::digits10 + 2> digits;  // and the sign
@@ -17,6 +21,22 @@ void TextWriter::Finish() {
     Write();
     if (_flushWanted) {
         _out.flush();
+    }
+}
+
+size_t TextWriter::ShownWidthOf(std::string_view text) const {
+    if (_showsControls) {
+        const std::string shown = AutoCli::AutoCli_ShowControls(text);
+        return _countsColumns ? ColumnsOf(shown) : shown.size();
+    }
+    return ColumnsOf(text);
+}
+
+void TextWriter::AppendSlowly(std::string_view text) {
+    if (_showsControls) {
+        AppendLong(AutoCli::AutoCli_ShowControls(text));
+    } else {
+        AppendLong(text);
     }
 }
 

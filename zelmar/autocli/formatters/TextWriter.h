@@ -1,5 +1,7 @@
 #pragma once
 
+#include <zelmar/autocli/formatters/Formatter.h>
+
 #include <algorithm>
 #include <array>
 #include <iosfwd>
@@ -13,7 +15,8 @@
 /// gathered too, and one flush stands for all.
 class TextWriter {
 public:
-    explicit TextWriter(std::ostream& out);
+    /// What the context says of control characters and columns holds for all that is appended.
+    explicit TextWriter(std::ostream& out, const AutoCli::DisplayContext& context = {});
     TextWriter(const TextWriter&) = delete;
     TextWriter& operator=(const TextWriter&) = delete;
 
@@ -46,11 +49,16 @@ public:
 
     void Finish();
 
+    /// The room that a text takes once it is appended: bytes, or columns of the terminal.
+    [[nodiscard]] size_t WidthOf(std::string_view text) const {
+        return _showsControls || _countsColumns ? ShownWidthOf(text) : text.size();
+    }
+
 private:
     template <class... Views>
     void AppendAll(Views... texts) {
-        if ((... + texts.size()) > _buffer.size() - _used) {
-            (AppendLong(texts), ...);
+        if (_showsControls || (... + texts.size()) > _buffer.size() - _used) {
+            (AppendSlowly(texts), ...);
             return;
         }
         char* end = _buffer.data() + _used;
@@ -58,13 +66,17 @@ private:
         _used = static_cast<size_t>(end - _buffer.data());
     }
 
+    void AppendSlowly(std::string_view text);
     void AppendLong(std::string_view text);
     void AppendManyBlanks(size_t count);
     void Write();
     void WriteLine();
+    [[nodiscard]] size_t ShownWidthOf(std::string_view text) const;
 
     std::ostream& _out;
     const bool _linesGather;
+    const bool _showsControls;
+    const bool _countsColumns;
     bool _flushWanted = false;
     size_t _used = 0;
     std::array<char, 4096> _buffer;  // not initialised: it is read only as far as it was written

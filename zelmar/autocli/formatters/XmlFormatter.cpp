@@ -149,9 +149,9 @@ XmlFormatter::XmlFormatter() : Formatter("xml") {
 }
 
 bool XmlFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
-                          FormatParameters& parameters, DisplayContext& /*context*/,
+                          FormatParameters& parameters, DisplayContext& context,
                           std::ostream& stream) {
-    TextWriter text(stream);
+    TextWriter text(stream, context);
     WriteHead(text, parameters);
     if (const auto root = output->GetRootObject()) {
         WriteValue<XmlWriter>(text, root.get(), 2);

@@ -56,14 +56,16 @@ public:
                                       const std::shared_ptr<CallSpec::Output>& output);
 
     /// Fills in the size of the terminal on standard output and, over its width, that of
-    /// `--screen-width`, which holds for the later lines of this dispatcher too.
+    /// `--screen-width`, which holds for the later lines of this dispatcher too. On a terminal,
+    /// control characters are to be shown, and columns counted where the locale is one of UTF-8.
     void GetDisplayContext(DisplayContext& context);
     /// The formatter "commandhelp", without parameters.
     FormatParameters GetHelpFormatParams();
 
     /// Prints the listing of a node's children.
     void PrintChildren(std::shared_ptr<NamespaceNode> node, std::shared_ptr<CommandOutput> output);
-    /// Prints the messages, if there are any, on the error stream under "Errors: ".
+    /// Prints the messages, if there are any, on the error stream under "Errors: ", as
+    /// `AutoCli_ErrorText` has them.
     void PrintError(const std::shared_ptr<CallSpec::Output>& output);
 
 private:

@@ -2,11 +2,10 @@
 #include <zelmar/internal/Utf8.h>
 
 #include <langinfo.h>
+#include <locale.h>
 #include <wchar.h>
 
-#include <locale.h>
 #include <algorithm>
-#include <clocale>
 
 namespace {
 

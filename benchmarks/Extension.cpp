@@ -94,7 +94,7 @@ void CompareStart() {
                       [&] {
                           Paired::RunProgram({.words = {PARSE_FLOOR, directory.Path()}});
                       },
-                      "at most 1.6"}});
+                      "at most 1"}});
 }
 
 void CompareGrowth() {

@@ -27,17 +27,17 @@ constexpr unsigned escaped = Mask(Treatment::Escaped);
 constexpr unsigned withoutSingle = Mask(Treatment::WithoutSingleQuotes);
 constexpr unsigned withoutDouble = Mask(Treatment::WithoutDoubleQuotes);
 constexpr unsigned unchanged = Mask(Treatment::Unchanged);
+constexpr unsigned any = escaped | withoutSingle | withoutDouble | unchanged;
 
 constexpr Hazard hazards[] = {
     {Quoting::Bare, escaped, "unquoted", Severity::Error, " \t\n?[#~",
      "on which the shell acts without quotes; write '$val{NAME}', in single quotes"},
-    {Quoting::Bare, withoutSingle | withoutDouble | unchanged, "quotes", Severity::Error,
-     " \t\n?[#~!\"$&'()*;<>\\^`|",
+    {Quoting::Bare, any & ~escaped, "quotes", Severity::Error, " \t\n?[#~!\"$&'()*;<>\\^`|",
      "and the quotes beside it belong to other words, so that nothing protects it; write "
      "'$val{NAME}' as an argument of its own"},
     {Quoting::Single, withoutSingle, "removed", Severity::Warning, "'",
      "which is silently taken out; keep it out by the constraint"},
-    {Quoting::Single, escaped | withoutDouble | unchanged, "quotes", Severity::Error, "'",
+    {Quoting::Single, any & ~withoutSingle, "quotes", Severity::Error, "'",
      "which ends the quotes around it; write '$val{NAME}' as an argument of its own"},
     {Quoting::Single, escaped, "visible", Severity::Warning, "\n!\"$&()*;<>\\^`|",
      "in front of which a backslash arrives; write '$val{NAME}' as an argument of its own"},
@@ -50,8 +50,10 @@ constexpr Hazard hazards[] = {
     {Quoting::Double, withoutSingle | unchanged, "quotes", Severity::Error, "$`\\\"",
      "which stay active, for the single quotes stand within double ones; write '$val{NAME}' as an "
      "argument of its own"},
-    {Quoting::Comment, escaped | withoutSingle | withoutDouble | unchanged, "quotes",
-     Severity::Error, "\n", "which end the comment around it; leave the comment out"},
+    {Quoting::SingleInBackquotes, any, "quotes", Severity::Error, "`\\",
+     "on which the backquotes around it act, even in single quotes; write $(...) for them"},
+    {Quoting::Comment, any, "quotes", Severity::Error, "\n",
+     "which end the comment around it; leave the comment out"},
 };
 
 std::string NameOfCharacter(char c) {
@@ -78,8 +80,16 @@ void Tell(const CheckedTemplate& checked, const DeclaredParameter& parameter, co
     const std::string& name = parameter.spec->GetName();
     std::string text = "--" + name + (parameter.hasConstraint ? "" : " has no constraint and") +
                        " may hold " + JoinedByOr(held) + ", " + std::string(hazard.text);
-    if (const size_t place = text.find("NAME"); place != std::string::npos) {
-        text.replace(place, 4, name);
+    constexpr std::string_view advised = "'$val{NAME}'";
+    if (const size_t place = text.find(advised); place == std::string::npos) {
+        // The advice fits any parameter.
+    } else if (parameter.spec->AllowMultiple()) {
+        text.replace(place, std::string::npos,
+                     "$multilist{" + name + ",--" + name +
+                         ",true}, and keep $, ` and \\ out by the "
+                         "constraint");
+    } else {
+        text.replace(place, advised.size(), "'$val{" + name + "}'");
     }
     hazard.severity == Severity::Error
         ? report.AddError(checked.node, hazard.rule, std::move(text))

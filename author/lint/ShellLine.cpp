@@ -184,7 +184,10 @@ private:
         const size_t end = _text.find('\'', _at + 1);
         AddToWord(_text.substr(_at + 1, end == npos ? end : end - _at - 1), true);
         _line.isClosed = _line.isClosed && end != npos;
-        Pass(end == npos ? end : end + 1, Quoting::Single);
+        const bool isInBackquotes =
+            std::ranges::find(_levels, Kind::Backquotes, &Level::kind) != _levels.end();
+        Pass(end == npos ? end : end + 1,
+             isInBackquotes ? Quoting::SingleInBackquotes : Quoting::Single);
     }
 
     void ReadPlain(char c) {

@@ -6,8 +6,9 @@
 
 namespace Author {
 
-/// What the quotes around a character of a shell line make of it.
-enum class Quoting : char { Bare, Single, Double, Comment };
+/// What the quotes around a character of a shell line make of it. In backquotes, single quotes keep
+/// backquotes and backslashes no longer.
+enum class Quoting : char { Bare, Single, SingleInBackquotes, Double, Comment };
 
 /// The first word of a simple command.
 struct ShellWord {

@@ -105,25 +105,17 @@ bool Session::RunLine(const std::string& line) {
 void Session::RunCommand(std::vector<std::string> words) {
     OptionParser parser;
     parser.ParseVector(std::move(words));
-    bool succeeded = false;
-    try {
-        // The dispatcher would end the process behind its usage text.
-        if (parser.HasDispatcherParameter("h") || parser.HasDispatcherParameter("help")) {
-            std::cout << helpText;
-        } else {
-            succeeded = _dispatcher.HandleOptions(parser, false);
-        }
-    } catch (const std::exception& error) {
-        PrintErrors(error.what());
-    } catch (...) {
-        PrintErrors("Unknown error");
+    _status = EXIT_FAILURE;
+    if (parser.HasDispatcherParameter("h") || parser.HasDispatcherParameter("help")) {
+        std::cout << helpText;
+    } else {
+        _status = _dispatcher.Run(parser, false);
     }
     if (!std::cout.flush()) {
         std::cout.clear();
         PrintErrors("Unable to write to standard output");
-        succeeded = false;
+        _status = EXIT_FAILURE;
     }
-    _status = succeeded ? EXIT_SUCCESS : EXIT_FAILURE;
 }
 
 void Session::Use(const std::vector<std::string>& names) {

@@ -2,6 +2,7 @@
 
 #include "Session.h"
 
+#include "../Environment.h"
 #include "../StandardStreams.h"
 
 #include <zelmar/zelmar.h>
@@ -11,7 +12,6 @@
 #include <clocale>
 #include <csignal>
 #include <cstdlib>
-#include <filesystem>
 #include <iostream>
 
 namespace {
@@ -29,14 +29,6 @@ void LeaveToScripts(int signal) {
     struct sigaction action = {};
     action.sa_handler = [](int) {};
     sigaction(signal, &action, nullptr);
-}
-
-// What the tool loads by itself.
-void LoadPlugins(AutoCli::CliDispatcher& dispatcher) {
-    std::error_code noError;
-    if (std::filesystem::exists("/usr/lib/norvane/kelvash", noError)) {
-        dispatcher.AddDefaultDirectories();
-    }
 }
 
 // Acts on the options of the shell; false when it cannot, which has been told.
@@ -63,7 +55,7 @@ int Run(int argc, char** argv) {
         return EXIT_SUCCESS;
     }
     AutoCli::CliDispatcher dispatcher;
-    LoadPlugins(dispatcher);
+    SetUpFromEnvironment(dispatcher);
     if (!HeedOptions(dispatcher, parser)) {
         return EXIT_FAILURE;
     }

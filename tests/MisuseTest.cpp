@@ -166,6 +166,12 @@ TEST(Misuse, OfDeclarations) {
     EXPECT_EQ(words->GetStringEnumWithDesc().at("fast"), "in a hurry");
 }
 
+struct Undeclared : TestCommand {
+    Undeclared() : TestCommand(Answer, {}) {}
+    std::shared_ptr<CallSpec::InputSpec> GetInputSpecInternal() override { return nullptr; }
+    std::shared_ptr<CallSpec::OutputSpec> GetOutputSpecInternal() override { return nullptr; }
+};
+
 TEST(Misuse, OfTheTree) {
     const auto root = RootNamespace::New(nullptr);
     const auto a = root->SubNamespace("a");
@@ -175,6 +181,8 @@ TEST(Misuse, OfTheTree) {
     const auto lost = TestCommand::New();
     loose->SetName("free");
     loose->RegisterNamespaceNode(lost, "cmd");
+    const auto undeclared = std::make_shared<Undeclared>();
+    root->SubNamespace("b")->RegisterNamespaceNode(undeclared, "cmd");
     const std::string rule =
         ", must be a name consisting of letters and numbers and must conform to 'camel' casing.";
     const std::string below = " Commands cannot have sub-commands or sub-namespaces.";
@@ -201,6 +209,8 @@ TEST(Misuse, OfTheTree) {
          " dispathcer reference."},
         {[] { (void)TestCommand::New()->GetDispatcher(); },
          "Invalid state for command with name ''. No parent node has been set."},
+        {[&] { undeclared->GetInputSpec(); }, "The command 'b cmd' declares no input"},
+        {[&] { undeclared->GetOutputSpec(); }, "The command 'b cmd' declares no output"},
         {[&] { root->SetParent(a); }, "Error, Root namespace cannot be assigned a parent node"},
     });
     EXPECT_EQ(a->GetNamespaceNodeNames(), std::vector<std::string>({"cmd"}));

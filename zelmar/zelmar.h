@@ -16,6 +16,7 @@
 #include <zelmar/autocli/NamespaceNode.h>
 #include <zelmar/autocli/OptionParser.h>
 #include <zelmar/autocli/Plugin.h>
+#include <zelmar/autocli/PluginEntry.h>
 #include <zelmar/autocli/SharedLibraryPlugin.h>
 #include <zelmar/autocli/completion/AnswerCompletion.h>
 #include <zelmar/autocli/completion/Completer.h>

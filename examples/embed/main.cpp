@@ -60,15 +60,6 @@ void Run(Dispatcher& dispatcher, const std::shared_ptr<CommandInput>& input) {
               << Format(dispatcher, input, output);
 }
 
-int RunAsTool(CliDispatcher& dispatcher, int argc, char** argv) {
-    try {
-        dispatcher.HandleArgvInput(argc, argv);
-    } catch (const std::exception& error) {
-        std::cerr << "Errors: \n" << error.what() << std::endl;
-        return EXIT_FAILURE;
-    }
-}
-
 }  // namespace
 
 int main(int argc, char** argv) {
@@ -78,7 +69,7 @@ int main(int argc, char** argv) {
                                                                                "list");
     AutoCli::AutoCli_AnswerCompletion(dispatcher);
     if (argc > 1) {
-        return RunAsTool(dispatcher, argc, argv);
+        return dispatcher.Run(argc, argv);
     }
 
     Run(dispatcher, Call({"room", "list"}));

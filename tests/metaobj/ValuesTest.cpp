@@ -63,7 +63,7 @@ TEST(Struct, TakesEveryKindOfValueUnderAnyName) {
     structure->SetField("a.b", Names({"x", "y"}));
     structure->SetField("Z", std::vector<long>({1, -2}));
     structure->SetField("bits", std::vector<bool>({true, false}));
-    structure->SetField("i", 3);
+    structure->SetField("i", 3U);
     structure->SetField("l", 1L << 40);
     structure->SetField("t", true);
     structure->SetField("s", Make("Inner", {{"n", MetaInt::New(1)}}));

@@ -35,6 +35,9 @@ CommandSpec::~CommandSpec() = default;
 std::shared_ptr<InputSpec> CommandSpec::GetInputSpec() {
     if (!_inputSpec) {
         _inputSpec = GetInputSpecInternal();
+        if (!_inputSpec) {
+            throw ZelmarException("The command '" + GetPathString(' ') + "' declares no input");
+        }
         _inputSpec->AddParameter(HelpParameter());
     }
     return _inputSpec;
@@ -43,6 +46,9 @@ std::shared_ptr<InputSpec> CommandSpec::GetInputSpec() {
 std::shared_ptr<OutputSpec> CommandSpec::GetOutputSpec() {
     if (!_outputSpec) {
         _outputSpec = GetOutputSpecInternal();
+        if (!_outputSpec) {
+            throw ZelmarException("The command '" + GetPathString(' ') + "' declares no output");
+        }
     }
     return _outputSpec;
 }

@@ -41,7 +41,8 @@ public:
     std::shared_ptr<NamespaceNode> GetParent() override;
     NamespaceNodeType GetType() override;
 
-    /// Each command builds its declarations here. They must not be null.
+    /// Each command builds its declarations here. They must not be null: who asks for such a one
+    /// gets the `ZelmarException` "The command '<path>' declares no input", or "no output".
     virtual std::shared_ptr<CallSpec::InputSpec> GetInputSpecInternal() = 0;
     virtual std::shared_ptr<CallSpec::OutputSpec> GetOutputSpecInternal() = 0;
 

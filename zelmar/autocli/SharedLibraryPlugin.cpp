@@ -1,4 +1,5 @@
 #include <zelmar/ZelmarException.h>
+#include <zelmar/autocli/PluginEntry.h>
 #include <zelmar/autocli/SharedLibraryPlugin.h>
 
 #include <dlfcn.h>
@@ -34,7 +35,7 @@ void SharedLibraryPlugin::Initialize() {
                               LoaderError());
     }
     _handle = std::move(object);
-    _registerNamespaces = reinterpret_cast<void (*)(std::shared_ptr<Namespace>)>(entry);
+    _registerNamespaces = reinterpret_cast<decltype(&AutoCli_RegisterNamespaces)>(entry);
 }
 
 const std::string& SharedLibraryPlugin::GetName() const {
@@ -42,11 +43,21 @@ const std::string& SharedLibraryPlugin::GetName() const {
 }
 
 void SharedLibraryPlugin::RegisterNamespaces(std::shared_ptr<Namespace> root) {
-    if (_registerNamespaces) {
-        if (const auto treeRoot = std::dynamic_pointer_cast<RootNamespace>(root)) {
-            treeRoot->KeepAlive(_handle);
-        }
+    if (!_registerNamespaces) {
+        return;
+    }
+    if (const auto treeRoot = std::dynamic_pointer_cast<RootNamespace>(root)) {
+        treeRoot->KeepAlive(_handle);
+    }
+    // The code of a foreign exception can go with the object: only its text leaves.
+    try {
         _registerNamespaces(std::move(root));
+    } catch (const ZelmarException&) {
+        throw;
+    } catch (const std::exception& error) {
+        throw ZelmarException(error.what());
+    } catch (...) {
+        throw ZelmarException("Unknown error");
     }
 }
 

@@ -8,10 +8,8 @@
 
 namespace AutoCli {
 
-/// A shared object that registers commands in code, or plugins with formatters. It exports a C
-/// function with one parameter, the root of the tree, to which it adds its nodes:
-///
-///     extern "C" void AutoCli_RegisterNamespaces(std::shared_ptr<AutoCli::Namespace> root);
+/// A shared object that registers commands in code, or plugins with formatters. It exports the
+/// function that `PluginEntry.h` declares.
 ///
 /// The object stays loaded for as long as this plugin, and the root that was handed to it, live:
 /// also when the registration fails half way, since nodes that hold its code may stay in the tree.
@@ -27,7 +25,8 @@ public:
     /// "Unable to get plugin registration point from <path> : <error>".
     void Initialize() override;
     [[nodiscard]] const std::string& GetName() const override;
-    /// Passes on what the object's function throws.
+    /// Passes on what the object's function throws; what is no `ZelmarException` becomes one with
+    /// the same text, or "Unknown error" where it has none.
     void RegisterNamespaces(std::shared_ptr<Namespace> root) override;
     bool HasFormatter(const std::string& name) override;
     std::shared_ptr<Formatter> GetFormatter(const std::string& name) override;

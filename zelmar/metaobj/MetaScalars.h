@@ -2,6 +2,9 @@
 
 #include <zelmar/metaobj/MetaObject.h>
 
+#include <concepts>
+#include <type_traits>
+
 // The three scalar values. They never change once made, so the factories hand out shared instances
 // of the most frequent ones: both booleans, the integers from -1 to 20, and the empty string cost
 // no allocation. The shared instances exist from the loading of the library until its unloading.
@@ -30,6 +33,16 @@ private:
     const bool _value;
 };
 
+/// Refuses, while it is compiled, a type with values that no `MetaInt` can hold.
+template <std::integral Integer>
+constexpr long FitInteger(Integer value) {
+    static_assert(
+        sizeof value < sizeof(long) || (sizeof value == sizeof(long) && std::is_signed_v<Integer>),
+        "A MetaInt holds a signed number of 64 bits: make sure that the value fits, and "
+        "cast it to long");
+    return static_cast<long>(value);
+}
+
 class ZELMAR_EXPORT MetaInt final : public MetaObject {
 public:
     static constexpr MetaType kind = MetaType::Int;
@@ -39,6 +52,11 @@ public:
     /// The instance for 0.
     static const std::shared_ptr<MetaInt>& New();
     static std::shared_ptr<MetaInt> New(long value);
+    /// For the other types of integers, as far as all their values fit.
+    template <std::integral Integer>
+    static std::shared_ptr<MetaInt> New(Integer value) {
+        return New(FitInteger(value));
+    }
 
     [[nodiscard]] long GetValue() const { return _value; }
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include <zelmar/metaobj/MetaObject.h>
+#include <zelmar/metaobj/MetaScalars.h>
 
 #include <map>
 #include <string>
@@ -84,6 +84,10 @@ public:
     void SetField(const std::string& name, long value);
     void SetField(const std::string& name, int value);
     void SetField(const std::string& name, bool value);
+    template <std::integral Integer>
+    void SetField(const std::string& name, Integer value) {
+        SetField(name, FitInteger(value));
+    }
     void SetField(const std::string& name, const std::string& value);
     void SetField(const std::string& name, std::string&& value);
     void SetField(const std::string& name, const char* value);

@@ -15,9 +15,9 @@ void AddCommand(AutoCli::NamespaceNode& host, const char* object, const char* de
 
 }  // namespace
 
-/// What the engine calls once it has loaded this object. It may throw `ZelmarException`; what is in
-/// the tree by then stays there.
-extern "C" ZELMAR_EXPORT void AutoCli_RegisterNamespaces(std::shared_ptr<AutoCli::Namespace> root) {
+/// What the engine calls once it has loaded this object. It may throw; what is in the tree by then
+/// stays there.
+void AutoCli_RegisterNamespaces(std::shared_ptr<AutoCli::Namespace> root) {
     const auto host = root->SubNamespace("host");
     host->SetDescription("This machine as its kernel sees it");
     AddCommand(*host, "info", "The machine itself", "get", Host::InfoGet::New());

@@ -150,7 +150,7 @@ int CliDispatcher::Run(OptionParser& parser, bool allowInput) {
         // which is no success
     } catch (const std::exception& error) {
         complain(error.what());
-        PrintHint(parser);
+        PrintHint(parser, allowInput);
     } catch (...) {
         complain("Unknown error");
     }
@@ -188,17 +188,19 @@ bool CliDispatcher::HandleOptions(OptionParser& parser, bool allowInput) {
     }
     PrintError(output);
     if (output->HasError()) {
-        PrintHint(parser);
+        PrintHint(parser, allowInput);
     }
     return command && !output->HasError();
 }
 
-void CliDispatcher::PrintHint(OptionParser& parser) {
+void CliDispatcher::PrintHint(OptionParser& parser, bool isArgv) {
     if (!_givesHints || isatty(STDERR_FILENO) == 0) {
         return;
     }
     try {
-        const std::string hint = FindHint(*this, parser, dispatcherOptions);
+        // A line of a stream or of a shell is typed without the name of the tool.
+        const std::string tool = isArgv ? parser.GetDispatcher() + " " : "";
+        const std::string hint = FindHint(*this, parser, tool, dispatcherOptions);
         if (!hint.empty()) {
             std::cerr << AutoCli_ErrorText(hint) << std::endl;
         }

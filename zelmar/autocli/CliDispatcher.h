@@ -77,7 +77,7 @@ private:
                      const FormatParameters& overrides, DisplayContext& context);
     [[nodiscard]] std::string ChosenFormatter(const Command& command, const CallSpec::Input& input,
                                               const FormatParameters& overrides) const;
-    void PrintHint(OptionParser& parser);
+    void PrintHint(OptionParser& parser, bool isArgv);
     void PrintUsage() const;
     void LoadPlugins(const OptionParser& parser);
 

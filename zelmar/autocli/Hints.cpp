@@ -107,13 +107,15 @@ std::shared_ptr<NamespaceNode> Follow(std::shared_ptr<NamespaceNode> node,
 // The line that failed, and what is known of it so far.
 class Line {
 public:
-    Line(Dispatcher& dispatcher, OptionParser& parser,
+    Line(Dispatcher& dispatcher, OptionParser& parser, const std::string& tool,
          std::span<const std::string_view> toolOptions)
-        : _dispatcher(dispatcher),
-          _parser(parser),
-          _toolOptions(toolOptions),
-          _tool(parser.GetDispatcher()),
-          _call(_tool) {}
+        : _dispatcher(dispatcher), _parser(parser), _toolOptions(toolOptions), _lead(tool) {
+        for (const auto& [name, value] : parser.GetDispatcherParameters()) {
+            if (name == "plugin" || name == "plugin-dir") {  // without it, there is no such path
+                _lead += Typed(name, value) + " ";
+            }
+        }
+    }
 
     std::string FindHint() {
         std::string hint = HintOnTakenWord();
@@ -157,7 +159,7 @@ private:
             }
             node = node->GetNamespaceNode(word);
             _command = std::dynamic_pointer_cast<Command>(node);
-            _call += " " + word;
+            _path += (_path.empty() ? "" : " ") + word;
         }
         return "";
     }
@@ -167,7 +169,8 @@ private:
         if (!required || word != _parser.GetCommandPath().back() || !IsPlain(word)) {
             return SeeHelp();
         }
-        return "A value follows its option: " + _call + " --" + required->GetName() + " " + word;
+        return "A value follows its option: " + _lead + _path + " --" + required->GetName() + " " +
+               word;
     }
 
     std::string HintOnToolOptions() {
@@ -178,12 +181,12 @@ private:
             const ParameterSpec* parameter =
                 _command ? FindParameter(*_command->GetInputSpec(), name) : nullptr;
             if (parameter) {
-                return "Options of a command stand behind its path: " + _call + " " +
+                return "Options of a command stand behind its path: " + _lead + _path + " " +
                        Typed(name, parameter->IsSecret() ? "" : value);
             }
             const std::string hint =
                 DidYouMean("--", NearestName(name, {_toolOptions.begin(), _toolOptions.end()}));
-            return hint.empty() ? "See: " + _tool + " --help" : hint;
+            return hint.empty() ? "See: " + _lead + "--help" : hint;
         }
         return "";
     }
@@ -210,8 +213,8 @@ private:
     std::string HintOnUnknownOption(const InputSpec& spec, const std::string& name,
                                     const std::string& value) {
         if (IsToolOption(name)) {
-            return "Options of " + _tool + " stand ahead of the path: " + _tool + " " +
-                   Typed(name, value) + _call.substr(_tool.size());
+            return "Options of the tool stand ahead of the path: " + _lead + Typed(name, value) +
+                   " " + _path;
         }
         return DidYouMean("--", NearestName(name, LongNames(spec)));
     }
@@ -238,7 +241,7 @@ private:
         return DidYouMean("--formatter ", NearestName(wanted.front(), names));
     }
 
-    [[nodiscard]] std::string SeeHelp() const { return "See: " + _call + " --help"; }
+    [[nodiscard]] std::string SeeHelp() const { return "See: " + _lead + _path + " --help"; }
 
     [[nodiscard]] bool IsToolOption(const std::string& name) const {
         return std::ranges::find(_toolOptions, name) != _toolOptions.end();
@@ -247,16 +250,16 @@ private:
     Dispatcher& _dispatcher;
     OptionParser& _parser;
     const std::span<const std::string_view> _toolOptions;
-    const std::string _tool;
-    std::string _call;  // as far as it was followed, as it is typed
+    std::string _lead;  // what is typed in front of the path
+    std::string _path;  // as far as it was followed
     std::shared_ptr<Command> _command;
 };
 
 }  // namespace
 
-std::string FindHint(Dispatcher& dispatcher, OptionParser& parser,
+std::string FindHint(Dispatcher& dispatcher, OptionParser& parser, const std::string& tool,
                      std::span<const std::string_view> toolOptions) {
-    return Line(dispatcher, parser, toolOptions).FindHint();
+    return Line(dispatcher, parser, tool, toolOptions).FindHint();
 }
 
 std::string NearestName(std::string_view word, const std::vector<std::string>& names) {

@@ -97,14 +97,10 @@ Keeping KeepingOf(Dispatcher& dispatcher, const std::vector<std::string>& words)
     bool isUnderstood = command || parser.GetCommandParameters().empty();
     for (const OptionParser::Option& option : parser.GetCommandParameters()) {
         const auto spec = command ? command->GetInputSpec() : CallSpec::InputSpec::New();
-        const auto& parameters = spec->GetParameterSpecs();
-        const auto parameter = std::ranges::find_if(parameters, [&](const auto& candidate) {
-            return candidate->GetName() == option.first ||
-                   candidate->GetShortName() == option.first;
-        });
-        if (parameter == parameters.end()) {
+        const CallSpec::ParameterSpec* const parameter = spec->FindOption(option.first);
+        if (!parameter) {
             isUnderstood = false;
-        } else if (IsSecret(**parameter, option)) {
+        } else if (IsSecret(*parameter, option)) {
             return Keeping::None;
         }
     }

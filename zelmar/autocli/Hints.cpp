@@ -63,15 +63,6 @@ std::string Typed(const std::string& name, const std::string& value) {
     return Dashed(name) + (value.empty() ? "" : " " + (IsPlain(value) ? value : "..."));
 }
 
-const ParameterSpec* FindParameter(const InputSpec& spec, const std::string& name) {
-    for (const auto& parameter : spec.GetParameterSpecs()) {
-        if (parameter->GetName() == name || parameter->GetShortName() == name) {
-            return parameter.get();
-        }
-    }
-    return nullptr;
-}
-
 std::vector<std::string> LongNames(const InputSpec& spec) {
     std::vector<std::string> names;
     for (const auto& parameter : spec.GetParameterSpecs()) {
@@ -179,7 +170,7 @@ private:
                 continue;
             }
             const ParameterSpec* parameter =
-                _command ? FindParameter(*_command->GetInputSpec(), name) : nullptr;
+                _command ? _command->GetInputSpec()->FindOption(name) : nullptr;
             if (parameter) {
                 return "Options of a command stand behind its path: " + _lead + _path + " " +
                        Typed(name, parameter->IsSecret() ? "" : value);
@@ -196,7 +187,7 @@ private:
         const auto input = CallSpec::Input::New();
         for (const auto& [name, value] : _parser.GetCommandParameters()) {
             input->AddParameter(name, value);
-            const ParameterSpec* parameter = FindParameter(*spec, name);
+            const ParameterSpec* parameter = spec->FindOption(name);
             std::string hint = parameter ? HintOnValue(*parameter, value)
                                          : HintOnUnknownOption(*spec, name, value);
             if (!hint.empty()) {

@@ -59,14 +59,6 @@ std::string TakeTop(std::stack<std::string>& words) {
     return word;
 }
 
-const ParameterSpec* FindByEitherName(const CallSpec::InputSpec& spec, const std::string& name) {
-    const auto& parameters = spec.GetParameterSpecs();
-    const auto found = std::ranges::find_if(parameters, [&name](const auto& parameter) {
-        return parameter->GetName() == name || parameter->GetShortName() == name;
-    });
-    return found == parameters.end() ? nullptr : found->get();
-}
-
 bool HasOption(const std::vector<OptionParser::Option>& options, const std::string& name) {
     return std::ranges::find(options, name, &OptionParser::Option::first) != options.end();
 }
@@ -153,7 +145,7 @@ std::vector<OptionParser::Option> OptionParser::ParseParameters(std::stack<std::
 }
 
 std::string OptionParser::ValueOfBareOption(const std::string& token, const std::string& name) {
-    const ParameterSpec* parameter = _inputSpec ? FindByEitherName(*_inputSpec, name) : nullptr;
+    const ParameterSpec* parameter = _inputSpec ? _inputSpec->FindOption(name) : nullptr;
     if (!parameter) {
         return "";  // an unknown name is for the validation to report
     }

@@ -54,6 +54,13 @@ const ParameterSpec* InputSpec::FindParameterSpec(const std::string& name) const
     return found != _parameters.end() && (*found)->GetName() == name ? found->get() : nullptr;
 }
 
+const ParameterSpec* InputSpec::FindOption(const std::string& name) const {
+    const auto found = std::ranges::find_if(_parameters, [&name](const auto& parameter) {
+        return parameter->GetName() == name || parameter->GetShortName() == name;
+    });
+    return found == _parameters.end() ? nullptr : found->get();
+}
+
 bool InputSpec::Validate(const std::shared_ptr<Input>& input,
                          const std::shared_ptr<Output>& output) const {
     if (input->HasParameter("help")) {

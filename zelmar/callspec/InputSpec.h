@@ -30,6 +30,8 @@ public:
     }
     /// The parameter of that long name, or null. It lives as long as this specification.
     [[nodiscard]] const ParameterSpec* FindParameterSpec(const std::string& name) const;
+    /// The same for the name of an option, which may be the short one.
+    [[nodiscard]] const ParameterSpec* FindOption(const std::string& name) const;
 
     /// Declares that the command wants this context value of its input.
     void SetContextSupported(const std::string& name) { _contexts.insert(name); }

@@ -82,6 +82,13 @@ bool IsGiven(const ParameterSpec& parameter, const std::vector<OptionParser::Opt
     });
 }
 
+void AddOption(const ParameterSpec& parameter, bool withShortName, Completion& completion) {
+    Add(completion, "--" + parameter.GetName(), parameter.GetDescription(true));
+    if (withShortName && !parameter.GetShortName().empty()) {
+        Add(completion, "-" + parameter.GetShortName(), parameter.GetDescription(true));
+    }
+}
+
 void AddEnum(const ParameterConstraint& constraint, Completion& completion) {
     for (const long number : constraint.GetIntEnum()) {
         Add(completion, std::to_string(number));
@@ -204,36 +211,31 @@ void Completer::CompleteBehindPath(OptionParser& parser, const Place& place,
     }
     if (const auto command = std::dynamic_pointer_cast<CommandSpec>(node)) {
         CompleteCommandOption(parser, *command, place, completion);
-    } else if (!hasOptions) {
+    } else if (!hasOptions && place.option.empty()) {
         AddChildren(*node, completion);
     }
 }
 
 void Completer::CompleteCommandOption(OptionParser& parser, CommandSpec& command,
                                       const Place& place, Completion& completion) const {
-    const auto& parameters = command.GetInputSpec()->GetParameterSpecs();
-    const auto toFill = std::ranges::find_if(parameters, [&place](const auto& parameter) {
-        return parameter->GetName() == place.option ||
-               (!place.option.empty() && parameter->GetShortName() == place.option);
-    });
-    const bool takesValue =
-        !place.option.empty() && (toFill == parameters.end() || !IsFlag(**toFill));
-    if (takesValue && toFill != parameters.end()) {
-        CompleteValue(command, **toFill, completion);
+    const auto spec = command.GetInputSpec();
+    if (!place.option.empty()) {
+        const ParameterSpec* const toFill = spec->FindOption(place.option);
+        if (toFill && !IsFlag(*toFill)) {
+            CompleteValue(command, *toFill, completion);
+        }
+        const bool takesValue = !toFill || !IsFlag(*toFill);
+        // A word such as -5 can be a value or the beginning of an option.
+        if (!completion.stem.empty() || (takesValue && !place.word.starts_with('-'))) {
+            return;
+        }
     }
-    if (!completion.stem.empty() || (takesValue && !place.word.starts_with('-'))) {
-        return;
-    }
-    const auto& given = parser.GetCommandParameters();
     for (const bool required : {true, false}) {
-        for (const auto& parameter : parameters) {
-            if (parameter->IsRequired() != required ||
-                (IsGiven(*parameter, given) && !parameter->AllowMultiple())) {
-                continue;
-            }
-            Add(completion, "--" + parameter->GetName(), parameter->GetDescription(true));
-            if (place.word == "-" && !parameter->GetShortName().empty()) {
-                Add(completion, "-" + parameter->GetShortName(), parameter->GetDescription(true));
+        for (const auto& parameter : spec->GetParameterSpecs()) {
+            if (parameter->IsRequired() == required &&
+                (parameter->AllowMultiple() ||
+                 !IsGiven(*parameter, parser.GetCommandParameters()))) {
+                AddOption(*parameter, place.word == "-", completion);
             }
         }
     }

@@ -17,7 +17,7 @@ void AddCommand(AutoCli::NamespaceNode& host, const char* object, const char* de
 
 /// What the engine calls once it has loaded this object. It may throw; what is in the tree by then
 /// stays there.
-void AutoCli_RegisterNamespaces(std::shared_ptr<AutoCli::Namespace> root) {
+extern "C" void AutoCli_RegisterNamespaces(std::shared_ptr<AutoCli::Namespace> root) {
     const auto host = root->SubNamespace("host");
     host->SetDescription("This machine as its kernel sees it");
     AddCommand(*host, "info", "The machine itself", "get", Host::InfoGet::New());

@@ -56,6 +56,14 @@ const char* WordFor(Severity severity) {
     return severity == Severity::Error ? "error" : "warning";
 }
 
+// A finding is a line, and what a file holds does not reach a terminal as a command.
+std::string OneLine(std::string text) {
+    for (char& c : text) {
+        c = static_cast<unsigned char>(c) < ' ' || c == '\x7f' ? ' ' : c;
+    }
+    return text;
+}
+
 }  // namespace
 
 bool Report::IsAllowed(const xmlNode* place, std::string_view rule) {
@@ -107,7 +115,8 @@ std::string AsLines(const std::vector<Finding>& findings) {
     std::string lines;
     for (const Finding& finding : findings) {
         lines += finding.file + ":" + std::to_string(finding.line) + ": " +
-                 WordFor(finding.severity) + ": " + finding.text + " [" + finding.rule + "]\n";
+                 WordFor(finding.severity) + ": " + OneLine(finding.text) + " [" + finding.rule +
+                 "]\n";
     }
     return lines;
 }

@@ -9,10 +9,12 @@
 
 #include <unistd.h>
 
+#include <cerrno>
 #include <clocale>
 #include <csignal>
 #include <cstdlib>
 #include <iostream>
+#include <string_view>
 
 namespace {
 
@@ -27,7 +29,11 @@ kelvash --input STDIN.
 // Such a signal ends the script that runs, in which it has its usual effect again, and not us.
 void LeaveToScripts(int signal) {
     struct sigaction action = {};
-    action.sa_handler = [](int) {};
+    action.sa_handler = [](int) {
+        const int error = errno;
+        [[maybe_unused]] const ssize_t count = write(STDOUT_FILENO, "\n", 1);  // behind the "^C"
+        errno = error;
+    };
     sigaction(signal, &action, nullptr);
 }
 
@@ -62,7 +68,9 @@ int Run(int argc, char** argv) {
     if (isatty(STDIN_FILENO) == 0 || isatty(STDOUT_FILENO) == 0) {
         return dispatcher.ParseStreamInput(std::cin) ? EXIT_SUCCESS : EXIT_FAILURE;
     }
-    if (!std::setlocale(LC_CTYPE, "")) {
+    // In the locale C, and in one that does not exist, Umlauts would be lost while they are typed.
+    const char* locale = std::setlocale(LC_CTYPE, "");
+    if (!locale || std::string_view(locale) == "C") {
         std::setlocale(LC_CTYPE, "C.UTF-8");
     }
     LeaveToScripts(SIGINT);

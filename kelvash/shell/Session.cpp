@@ -24,22 +24,16 @@ const std::array<CompletionCandidate, 3> ownCommands = {{
     {"use", "Stand in a namespace, or in the root again"},
 }};
 
-constexpr const char* helpText = R"(Type a path and the options of its command, as behind kelvash:
+constexpr const char* helpText = R"( In this shell: 
+       <Tab>                           Complete the word, or list what can follow
+       ?                               List what can follow
+       use <namespace>                 Stand in a namespace; use alone: in the root again
+       exit, quit, Ctrl-D              Leave
+       Ctrl-C                          Give up the line, or end the script that runs
 
-    host mount list --type ext4
-
-    <Tab>                complete the word, or list what can follow
-    ?                    list what can follow
-    use <namespace>      stand in a namespace; use alone: in the root again
-    exit, quit, Ctrl-D   leave
-    Ctrl-C               give up the line, or end the script that runs
-
-Options of the tool stand in front of the path: --formatter <formatter>,
---format-param <key>=<value>, --screen-width <width>, --plugin <file>,
---plugin-dir <folder>. Behind the path, --help tells about the command.
 )";
 
-void PrintErrors(const char* message) {
+void PrintError(const std::string& message) {
     std::cout.flush();
     std::cerr << "Errors: \n" << AutoCli::AutoCli_ErrorText(message) << std::endl;
 }
@@ -105,15 +99,13 @@ bool Session::RunLine(const std::string& line) {
 void Session::RunCommand(std::vector<std::string> words) {
     OptionParser parser;
     parser.ParseVector(std::move(words));
-    _status = EXIT_FAILURE;
+    _status = _dispatcher.Run(parser, false);
     if (parser.HasDispatcherParameter("h") || parser.HasDispatcherParameter("help")) {
         std::cout << helpText;
-    } else {
-        _status = _dispatcher.Run(parser, false);
     }
     if (!std::cout.flush()) {
         std::cout.clear();
-        PrintErrors("Unable to write to standard output");
+        PrintError("Unable to write to standard output");
         _status = EXIT_FAILURE;
     }
 }
@@ -125,7 +117,7 @@ void Session::Use(const std::vector<std::string>& names) {
         _namespace = path;
         _status = EXIT_SUCCESS;
     } else {
-        PrintErrors(("There is no namespace '" + names.back() + "' to use").c_str());
+        PrintError("There is no namespace '" + names.back() + "' to use");
         _status = EXIT_FAILURE;
     }
 }

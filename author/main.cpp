@@ -21,6 +21,7 @@ int Run(int argc, char** argv) {
     int status = EXIT_SUCCESS;
     Author::AddLint(program, status);
     Author::AddSchema(program, status);
+    Author::AddTest(program, status);
     try {
         program.parse(argc, argv);
     } catch (const CLI::ParseError& error) {

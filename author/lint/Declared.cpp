@@ -56,6 +56,13 @@ Loaded Load(const xmlNode* node) {
     }
 }
 
+// Is anything wrong but the parameters?
+bool IsRefusedWithoutParameters(const xmlNode* node) {
+    const NodeCopy bare = CopyCommand(node);
+    RemoveChildren(Child(bare.get(), "input-spec"), "parameter");
+    return !Load(bare.get()).command;
+}
+
 // Each parameter alone; those that are refused lose their constraints in the copy.
 void JudgeParameters(const xmlNode* node, xmlNode* copy, Report& report,
                      std::vector<std::string>& refused) {
@@ -136,6 +143,7 @@ const DeclaredParameter* DeclaredCommand::Find(const std::string& name) const {
 
 std::vector<std::string> DeclaredCommand::ParameterNames() const {
     std::vector<std::string> names;
+    names.reserve(parameters.size());
     for (const DeclaredParameter& parameter : parameters) {
         names.push_back(parameter.spec->GetName());
     }
@@ -146,7 +154,7 @@ std::optional<DeclaredCommand> ReadCommand(const xmlNode* node, Report& report) 
     const NodeCopy copy = CopyCommand(node);
     std::vector<std::string> refused;
     Loaded loaded = Load(copy.get());
-    if (!loaded.command) {
+    if (!loaded.command && !IsRefusedWithoutParameters(node)) {
         JudgeParameters(node, copy.get(), report, refused);
         loaded = Load(copy.get());
     }

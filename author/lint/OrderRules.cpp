@@ -18,6 +18,7 @@ using Around = std::vector<const TemplateNode*>;
 
 std::string Options(const std::vector<std::string>& options) {
     std::vector<std::string> words;
+    words.reserve(options.size());
     for (const std::string& option : options) {
         words.push_back("--" + option);
     }

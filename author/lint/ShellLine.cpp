@@ -143,10 +143,7 @@ private:
         if (ReadExpansion(Quoting::Double, Kind::QuotedBraces)) {
             return;
         }
-        if (c == '"' && Top().kind == Kind::DoubleQuotes) {
-            Pass(_at + 1, Quoting::Double);
-            Close();
-        } else if (c == '}' && Top().kind == Kind::QuotedBraces) {
+        if (c == (Top().kind == Kind::DoubleQuotes ? '"' : '}')) {
             Pass(_at + 1, Quoting::Double);
             Close();
         } else {

@@ -52,6 +52,15 @@ bool IsSecret(const CallSpec::ParameterSpec& parameter, const OptionParser::Opti
     return parameter.IsSecret() && !option.second.empty();
 }
 
+// What a command takes; nothing for none, and for one whose declaration is faulty.
+std::shared_ptr<CallSpec::InputSpec> SpecOf(AutoCli::CommandSpec* command) {
+    try {
+        return command ? command->GetInputSpec() : CallSpec::InputSpec::New();
+    } catch (...) {
+        return CallSpec::InputSpec::New();
+    }
+}
+
 }  // namespace
 
 std::vector<std::string> WordsOf(const std::string& line) {
@@ -84,7 +93,7 @@ std::shared_ptr<AutoCli::NamespaceNode> FindNode(Dispatcher& dispatcher, const P
         const auto root = dispatcher.GetRootNamespace();
         Path rest = path;
         return path.empty() ? root : root->ResolveNode(rest);
-    } catch (const std::exception&) {
+    } catch (...) {
         return nullptr;
     }
 }
@@ -94,9 +103,9 @@ Keeping KeepingOf(Dispatcher& dispatcher, const std::vector<std::string>& words)
     parser.ParseVector(words);
     const auto node = FindNode(dispatcher, parser.GetCommandPath());
     const auto command = std::dynamic_pointer_cast<AutoCli::CommandSpec>(node);
+    const auto spec = SpecOf(command.get());
     bool isUnderstood = command || parser.GetCommandParameters().empty();
     for (const OptionParser::Option& option : parser.GetCommandParameters()) {
-        const auto spec = command ? command->GetInputSpec() : CallSpec::InputSpec::New();
         const CallSpec::ParameterSpec* const parameter = spec->FindOption(option.first);
         if (!parameter) {
             isUnderstood = false;

@@ -63,8 +63,12 @@ std::vector<std::string> History::Load() {
     if (file < 0) {
         return lines;
     }
-    std::istringstream text(ReadAll(file));
+    const std::string content = ReadAll(file);
     close(file);
+    if (!content.empty() && !content.ends_with('\n')) {
+        Append("");  // ends a line that a session could write by half only
+    }
+    std::istringstream text(content);
     for (std::string line; std::getline(text, line);) {
         // What a broken file may hold and no line can.
         if (!line.empty() && line.find('\0') == std::string::npos) {

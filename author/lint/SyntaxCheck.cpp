@@ -40,9 +40,9 @@ void SyntaxCheck::Add(std::string line, Finding finding) {
 
 std::vector<Finding> SyntaxCheck::Run() {
     std::vector<Finding> findings;
-    const auto others = std::ranges::stable_partition(
-        _units, [](const Unit& unit) { return StandsAlone(unit.line); });
-    const size_t together = _units.size() - others.size();
+    const auto others = std::stable_partition(
+        _units.begin(), _units.end(), [](const Unit& unit) { return StandsAlone(unit.line); });
+    const auto together = static_cast<size_t>(others - _units.begin());
     for (size_t begin = 0; begin < _units.size();) {
         const size_t end = begin < together ? std::min(begin + largestBatch, together) : begin + 1;
         Judge(begin, end, findings);

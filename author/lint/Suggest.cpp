@@ -17,10 +17,10 @@ char Fold(char c) {
 size_t Distance(std::string_view one, std::string_view other) {
     std::vector<size_t> row(other.size() + 1);
     std::iota(row.begin(), row.end(), size_t{0});
-    for (size_t i = 0; i < one.size(); ++i) {
+    for (const char c : one) {
         size_t diagonal = row[0]++;
         for (size_t j = 0; j < other.size(); ++j) {
-            const size_t replaced = diagonal + (Fold(one[i]) == Fold(other[j]) ? 0 : 1);
+            const size_t replaced = diagonal + (Fold(c) == Fold(other[j]) ? 0 : 1);
             diagonal = row[j + 1];
             row[j + 1] = std::min({replaced, row[j] + 1, row[j + 1] + 1});
         }

@@ -1,4 +1,5 @@
 #include <author/Verbs.h>
+#include <zelmar/Version.h>
 
 #include <CLI/CLI.hpp>
 

@@ -245,7 +245,7 @@ void Server::Initialize(const Request& request, const Json& parameters) {
                    {"serverInfo",
                     {{"name", "kelvash-mcp"},
                      {"title", "Administrative commands of this machine"},
-                     {"version", VERSION}}},
+                     {"version", Zelmar::GetVersion()}}},
                    {"instructions",
                     "Each tool is an administrative command of this machine. The server checks"
                     " arguments and results against what the command declares, and reports all"

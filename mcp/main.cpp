@@ -50,7 +50,7 @@ void Declare(CLI::App& app, Options& options) {
         ->capture_default_str();
     app.add_flag("--print-tools", options.printsTools,
                  "Print the tools with their schemas as JSON, and end");
-    app.set_version_flag("--version", std::string("kelvash-mcp ") + VERSION);
+    app.set_version_flag("--version", std::string("kelvash-mcp ") + Zelmar::GetVersion());
 }
 
 // Sets the standard descriptor free for what commands do with it: it leads to `target` from now on.

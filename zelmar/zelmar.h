@@ -3,6 +3,7 @@
 /// Everything that hosts and plugins use.
 
 #include <zelmar/Export.h>
+#include <zelmar/Version.h>
 #include <zelmar/ZelmarException.h>
 #include <zelmar/autocli/CliDispatcher.h>
 #include <zelmar/autocli/Command.h>

@@ -11,6 +11,7 @@ namespace Author {
 
 /// `status` becomes the exit status of the program: 0, or 1 when something was found.
 void AddLint(CLI::App& program, int& status);
+void AddNew(CLI::App& program, int& status);
 void AddSchema(CLI::App& program, int& status);
 void AddTest(CLI::App& program, int& status);
 

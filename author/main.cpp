@@ -21,6 +21,7 @@ int Run(int argc, char** argv) {
     program.require_subcommand(1);
     int status = EXIT_SUCCESS;
     Author::AddLint(program, status);
+    Author::AddNew(program, status);
     Author::AddSchema(program, status);
     Author::AddTest(program, status);
     try {

@@ -29,10 +29,12 @@ LineEditor::LineEditor(Proposer propose)
     el_source(editor, nullptr);
     // Ctrl-C belongs to the line and not to the process as long as one is typed.
     el_set(editor, EL_SETTY, "-d", "-isig", nullptr);
-    el_set(editor, EL_ADDFN, "zelmar-complete", "Complete the word", &LineEditor::Complete);
-    el_set(editor, EL_ADDFN, "zelmar-list", "List what can follow", &LineEditor::ListOrInsert);
-    el_set(editor, EL_ADDFN, "zelmar-give-up", "Give up the line", &LineEditor::GiveUpLine);
-    el_set(editor, EL_ADDFN, "zelmar-stop", "Stop the shell", &LineEditor::Stop);
+    // The wide form keeps these texts themselves; the other one makes copies and loses them.
+    // In its wide form, which keeps these texts: the other one makes copies that it never frees.
+    el_wset(editor, EL_ADDFN, L"zelmar-complete", L"Complete the word", &LineEditor::Complete);
+    el_wset(editor, EL_ADDFN, L"zelmar-list", L"List what can follow", &LineEditor::ListOrInsert);
+    el_wset(editor, EL_ADDFN, L"zelmar-give-up", L"Give up the line", &LineEditor::GiveUpLine);
+    el_wset(editor, EL_ADDFN, L"zelmar-stop", L"Stop the shell", &LineEditor::Stop);
     el_set(editor, EL_BIND, "^I", "zelmar-complete", nullptr);
     el_set(editor, EL_BIND, "?", "zelmar-list", nullptr);
     el_set(editor, EL_BIND, "^C", "zelmar-give-up", nullptr);

@@ -1,4 +1,4 @@
-#!/usr/bin/env python3
+#!/usr/bin/python3
 """Runs a command on a terminal of its own.
 
     typed [WAIT KEYS]... -- COMMAND...

@@ -50,10 +50,11 @@ NewParameter ReadParameter(const std::string& spec) {
     if (!isRead || (match[4].matched && !match.str(3).starts_with("int"))) {
         throw std::invalid_argument(
             "'" + spec +
-            "' is no parameter; write NAME:TYPE, or NAME?:TYPE if it can be left out, where TYPE "
-            "is "
-            "string, int, int=MIN..MAX, bool, flag, one of these with -list behind the word if it "
-            "may be repeated (string-list, int-list, bool-list), or values: full|diff");
+            "' is no parameter; write NAME:TYPE, or NAME?:TYPE if it can be left out, where NAME "
+            "has "
+            "two small letters or more and TYPE is string, int, int=MIN..MAX, bool, flag, one of "
+            "these with -list behind the word if it may be repeated (string-list, int-list, "
+            "bool-list), or values: full|diff");
     }
     NewParameter parameter{match[1], match[3], !match[2].matched, match[4], match[5], {}};
     if (match[6].matched) {

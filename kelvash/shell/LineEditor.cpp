@@ -30,7 +30,6 @@ LineEditor::LineEditor(Proposer propose)
     // Ctrl-C belongs to the line and not to the process as long as one is typed.
     el_set(editor, EL_SETTY, "-d", "-isig", nullptr);
     // The wide form keeps these texts themselves; the other one makes copies and loses them.
-    // In its wide form, which keeps these texts: the other one makes copies that it never frees.
     el_wset(editor, EL_ADDFN, L"zelmar-complete", L"Complete the word", &LineEditor::Complete);
     el_wset(editor, EL_ADDFN, L"zelmar-list", L"List what can follow", &LineEditor::ListOrInsert);
     el_wset(editor, EL_ADDFN, L"zelmar-give-up", L"Give up the line", &LineEditor::GiveUpLine);

@@ -5,6 +5,7 @@
 #include <fcntl.h>
 #include <libxml/SAX2.h>
 #include <libxml/parser.h>
+#include <sys/stat.h>
 
 #include <algorithm>
 #include <cerrno>
@@ -300,9 +301,11 @@ int TakeText(void* rest, char* buffer, int size) {
     return static_cast<int>(count);
 }
 
-// In the words, and on the stream, that libxml2 has for a file that it cannot open.
+// In the words, and on the stream, that libxml2 has for a file that it cannot open. The reason is
+// told of a file that is there, and twice, since libxml2 tries such a file twice.
 void TellUnopened(const std::string& path, int error) {
-    if (error != ENOENT) {
+    struct stat status = {};
+    for (int attempt = 0; attempt < 2 && stat(path.c_str(), &status) == 0; ++attempt) {
         xmlGenericError(xmlGenericErrorContext, "I/O error : %s\n", std::strerror(error));
     }
     xmlGenericError(xmlGenericErrorContext, "I/O warning : failed to load external entity \"%s\"\n",

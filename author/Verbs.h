@@ -14,5 +14,6 @@ void AddLint(CLI::App& program, int& status);
 void AddNew(CLI::App& program, int& status);
 void AddSchema(CLI::App& program, int& status);
 void AddTest(CLI::App& program, int& status);
+void AddTry(CLI::App& program, int& status);
 
 }  // namespace Author

@@ -24,6 +24,7 @@ int Run(int argc, char** argv) {
     Author::AddNew(program, status);
     Author::AddSchema(program, status);
     Author::AddTest(program, status);
+    Author::AddTry(program, status);
     try {
         program.parse(argc, argv);
     } catch (const CLI::ParseError& error) {

@@ -88,9 +88,7 @@ std::shared_ptr<OutputSpec> ExtensionCommand::GetOutputSpecInternal() {
 
 void ExtensionCommand::ExecuteInternal(const std::shared_ptr<Input>& input,
                                        const std::shared_ptr<Output>& output) {
-    const bool hasLanguage = std::getenv("LANG") != nullptr;
-    const std::string commandLine =
-        (hasLanguage ? "" : "LANG=en_US.UTF-8 ") + SubstituteInput(input, false);
+    const std::string commandLine = GetCommandLine(input);
     const std::string stdinText = SubstituteInput(input, true);
     std::string user;
     if (GetInputSpec()->IsContextSupported("user")) {
@@ -103,9 +101,18 @@ void ExtensionCommand::ExecuteInternal(const std::shared_ptr<Input>& input,
         ReportNoData(commandLine, status, *output);
         return;
     }
-    AddErrorLines(printed, *output);
-    if (!output->HasError()) {
-        SetValue(printed, status, *output);
+    ReadPrinted(printed, status, *output);
+}
+
+std::string ExtensionCommand::GetCommandLine(const std::shared_ptr<Input>& input) {
+    const bool hasLanguage = std::getenv("LANG") != nullptr;
+    return (hasLanguage ? "" : "LANG=en_US.UTF-8 ") + SubstituteInput(input, false);
+}
+
+void ExtensionCommand::ReadPrinted(std::string_view printed, int status, Output& output) {
+    AddErrorLines(printed, output);
+    if (!output.HasError()) {
+        SetValue(printed, status, output);
     }
 }
 

@@ -4,6 +4,7 @@
 
 #include <memory>
 #include <string>
+#include <string_view>
 #include <utility>
 
 namespace AutoCli {
@@ -56,6 +57,15 @@ public:
     /// `Input::GetParameter` throws when the template reads a flag or a list with `$val`. Time is
     /// linear in the text for each parameter that was given.
     std::string SubstituteInput(const std::shared_ptr<CallSpec::Input>& input, bool isStdin);
+
+    /// The line that `ExecuteInternal` hands to `AutoCli_ShellCmd`: the template of the command
+    /// line, expanded, behind `LANG=en_US.UTF-8` where the environment has no `LANG`. With
+    /// `ReadPrinted`, for a tool that runs the line in its own way. Throws as `SubstituteInput`.
+    std::string GetCommandLine(const std::shared_ptr<CallSpec::Input>& input);
+    /// What `ExecuteInternal` takes from a process that printed this, which is not empty, and ended
+    /// with this raw status: the messages of its `ERROR:` lines, or else the value, the message
+    /// about one that cannot be built, or that of a process that a signal ended without one.
+    static void ReadPrinted(std::string_view printed, int status, CallSpec::Output& output);
 
     /// The value with a backslash in front of each character that `isBadChar` names.
     [[nodiscard]] std::string SanitizeInput(const std::string& value) const;

@@ -1,8 +1,6 @@
 #include <author/try/Report.h>
 #include <zelmar/zelmar.h>
 
-#include <boost/algorithm/string/replace.hpp>
-
 #include <algorithm>
 #include <cstdio>
 
@@ -22,7 +20,10 @@ void Secrets::Add(const std::string& value) {
 
 std::string Secrets::Hide(std::string text) const {
     for (const std::string& secret : _texts) {
-        boost::algorithm::replace_all(text, secret, dots);
+        for (size_t at = 0; (at = text.find(secret, at)) != std::string::npos;) {
+            text.replace(at, secret.size(), dots);
+            at += std::string_view(dots).size();
+        }
     }
     return text;
 }

@@ -100,9 +100,12 @@ void ParameterConstraint::GetIntRange(long& min, long& max) const {
     max = _max;
 }
 
-void ParameterConstraint::AddIntEnum(long value) {
+void ParameterConstraint::AddIntEnum(long value, std::string description) {
     if (Contains(_intEnum, value)) {
         throw ZelmarException("Duplicate Value found in ParameterConstraint::AddIntEnum");
+    }
+    if (!description.empty()) {
+        _intEnumDesc[value] = std::move(description);
     }
     _intEnum.push_back(value);
 }

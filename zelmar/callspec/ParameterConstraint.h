@@ -36,10 +36,16 @@ public:
     void SetIntRange(long min, long max);
     void GetIntRange(long& min, long& max) const;
 
-    /// Throws `ZelmarException`: "Duplicate Value found in ParameterConstraint::AddIntEnum".
-    void AddIntEnum(long value);
+    /// An empty description is as none. Throws `ZelmarException`: "Duplicate Value found in
+    /// ParameterConstraint::AddIntEnum".
+    void AddIntEnum(long value) { AddIntEnum(value, ""); }
+    void AddIntEnum(long value, std::string description);
     /// In the order of addition.
     [[nodiscard]] const std::vector<long>& GetIntEnum() const { return _intEnum; }
+    /// The members that have a description, by value. Help does not show it, completion does.
+    [[nodiscard]] const std::map<long, std::string>& GetIntEnumWithDesc() const {
+        return _intEnumDesc;
+    }
 
     /// An empty description is as none. Throws `ZelmarException`: "Duplicate Value found in
     /// ParameterConstraint::AddStringEnum: <value>".
@@ -69,6 +75,7 @@ private:
     long _min = 0;
     long _max = 0;
     std::vector<long> _intEnum;
+    std::map<long, std::string> _intEnumDesc;
     std::vector<std::string> _stringEnum;
     std::string _regex;
     std::map<std::string, std::string> _stringEnumDesc;

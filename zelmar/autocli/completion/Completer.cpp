@@ -5,6 +5,7 @@
 
 #include <algorithm>
 #include <array>
+#include <map>
 #include <set>
 #include <string_view>
 
@@ -89,14 +90,19 @@ void AddOption(const ParameterSpec& parameter, bool withShortName, Completion& c
     }
 }
 
+template <class Member>
+std::string DescriptionOf(const Member& member, const std::map<Member, std::string>& descriptions) {
+    const auto description = descriptions.find(member);
+    return description == descriptions.end() ? "" : description->second;
+}
+
 void AddEnum(const ParameterConstraint& constraint, Completion& completion) {
     for (const long number : constraint.GetIntEnum()) {
-        Add(completion, std::to_string(number));
+        Add(completion, std::to_string(number),
+            DescriptionOf(number, constraint.GetIntEnumWithDesc()));
     }
-    const auto& descriptions = constraint.GetStringEnumWithDesc();
     for (const std::string& member : constraint.GetStringEnum()) {
-        const auto description = descriptions.find(member);
-        Add(completion, member, description == descriptions.end() ? "" : description->second);
+        Add(completion, member, DescriptionOf(member, constraint.GetStringEnumWithDesc()));
     }
 }
 

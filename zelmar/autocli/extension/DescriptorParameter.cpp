@@ -55,7 +55,7 @@ bool FillIntEnum(const XmlNode& node, ParameterConstraint& constraint) {
             throw ZelmarException("Error parsing integer enumeration. Expected integer, but got " +
                                   value);
         }
-        constraint.AddIntEnum(*number);
+        constraint.AddIntEnum(*number, description);
     }
     return !entries.empty();
 }

@@ -194,7 +194,9 @@ bool CliDispatcher::HandleOptions(OptionParser& parser, bool allowInput) {
 }
 
 void CliDispatcher::PrintHint(OptionParser& parser, bool isArgv) {
-    if (!_givesHints || isatty(STDERR_FILENO) == 0) {
+    // With `--input`, the line that failed is one of the stream, and gone.
+    if (!_givesHints || isatty(STDERR_FILENO) == 0 ||
+        (isArgv && parser.HasDispatcherParameter("input"))) {
         return;
     }
     try {

@@ -1,42 +1,8 @@
-#include "Environment.h"
-#include "StandardStreams.h"
-
-#include <zelmar/zelmar.h>
-
-#include <malloc.h>
-
-#include <csignal>
-#include <cstdlib>
-#include <iostream>
-#include <optional>
-
-namespace {
-
-int ReportAndFail(const char* message) {
-    std::cerr << "Errors: \n" << AutoCli::AutoCli_ErrorText(message) << std::endl;
-    return EXIT_FAILURE;
-}
-
-}  // namespace
+#include "Program.h"
 
 int main(int argc, char** argv) {
-    FillClosedStreams();
-    CheckStandardOutputAtExit();
-    // A caller that ignores the end of its children passes that on; a command waits for its own.
-    std::signal(SIGCHLD, SIG_DFL);
-    // Values are many small pieces that go at one time. Kept apart in the fast bins of the C
-    // library, they would be joined again later, at a multiple of what it costs as they go.
-    mallopt(M_MXFAST, 0);
-    // Outlives the handlers: the code of what they catch may lie in a plugin that goes with it.
-    std::optional<AutoCli::CliDispatcher> dispatcher;
-    try {
-        dispatcher.emplace();
-        SetUpFromEnvironment(*dispatcher);
-        AutoCli::AutoCli_AnswerCompletion(*dispatcher);
-        std::exit(dispatcher->Run(argc, argv));  // without taking the tree down first
-    } catch (const std::exception& error) {
-        return ReportAndFail(error.what());
-    } catch (...) {
-        return ReportAndFail("Unknown error");
-    }
+    return RunProgram([=](AutoCli::CliDispatcher& dispatcher) {
+        AutoCli::AutoCli_AnswerCompletion(dispatcher);
+        return dispatcher.Run(argc, argv);
+    });
 }

@@ -238,7 +238,7 @@ void Session::PrintChoice(const Completion& completion) const {
         std::cout << "and " << candidates.size() - mostChoices << " more" << std::endl;
     }
     if (!completion.message.empty()) {
-        std::cout << completion.message << std::endl;
+        std::cout << AutoCli::AutoCli_ShowControls(completion.message) << std::endl;
     }
 }
 

@@ -2,10 +2,7 @@
 
 #include "Session.h"
 
-#include "../Environment.h"
-#include "../StandardStreams.h"
-
-#include <zelmar/zelmar.h>
+#include "../Program.h"
 
 #include <unistd.h>
 
@@ -53,15 +50,13 @@ bool HeedOptions(AutoCli::CliDispatcher& dispatcher, AutoCli::OptionParser& pars
     return dispatcher.HandleDispatcherOptions(parser, none, AutoCli::CommandOutput::New());
 }
 
-int Run(int argc, char** argv) {
+int Run(AutoCli::CliDispatcher& dispatcher, int argc, char** argv) {
     AutoCli::OptionParser parser;
     parser.ParseArgv(argc, argv);
     if (parser.HasDispatcherParameter("h") || parser.HasDispatcherParameter("help")) {
         std::cout << usage;
         return EXIT_SUCCESS;
     }
-    AutoCli::CliDispatcher dispatcher;
-    SetUpFromEnvironment(dispatcher);
     if (!HeedOptions(dispatcher, parser)) {
         return EXIT_FAILURE;
     }
@@ -81,13 +76,6 @@ int Run(int argc, char** argv) {
 }  // namespace
 
 int main(int argc, char** argv) {
-    FillClosedStreams();
-    CheckStandardOutputAtExit();
-    std::signal(SIGCHLD, SIG_DFL);  // a command waits for its own, whatever our caller ignores
-    try {
-        return Run(argc, argv);
-    } catch (const std::exception& error) {
-        std::cerr << "Errors: \n" << error.what() << std::endl;
-    }
-    return EXIT_FAILURE;
+    return RunProgram(
+        [=](AutoCli::CliDispatcher& dispatcher) { return Run(dispatcher, argc, argv); });
 }

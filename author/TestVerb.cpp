@@ -2,6 +2,7 @@
 #include <author/Verbs.h>
 #include <author/test/Correction.h>
 #include <author/test/Guarded.h>
+#include <author/test/Probe.h>
 
 #include <CLI/CLI.hpp>
 
@@ -43,8 +44,11 @@ struct TestOptions {
     std::string programs;
     std::vector<std::string> links;
     std::vector<std::string> environment;
+    std::vector<std::string> plugins;
     unsigned limit = 60;
     bool isUpdate = false;
+    bool isProbe = false;
+    bool mayChange = false;
 };
 
 std::pair<std::string, std::string> Split(const std::string& text) {
@@ -55,21 +59,29 @@ std::pair<std::string, std::string> Split(const std::string& text) {
     return {text.substr(0, place), text.substr(place + 1)};
 }
 
+// Each NAME=VALUE; a bare name hands on the caller's, if there is one.
+std::vector<std::string> Variables(const std::vector<std::string>& given) {
+    std::vector<std::string> variables;
+    for (const std::string& variable : given) {
+        const char* value = std::getenv(variable.c_str());
+        if (variable.find('=') != std::string::npos) {
+            variables.push_back(variable);
+        } else if (value) {
+            variables.push_back(variable + "=" + value);
+        }
+    }
+    return variables;
+}
+
 SessionOptions SessionFor(const TestOptions& options) {
     SessionOptions session;
     session.limit = std::chrono::seconds(options.limit);
     std::ranges::transform(options.links, std::back_inserter(session.links), Split);
-    std::vector<std::string> variables = options.environment;
+    session.environment = Variables(options.environment);
     const char* path = std::getenv("PATH");
-    variables.push_back("PATH=" + options.programs + (options.programs.empty() ? "" : ":") +
-                        (path ? path : "/usr/bin:/bin"));
-    for (const std::string& variable : variables) {
-        if (variable.find('=') != std::string::npos) {
-            session.environment.push_back(variable);
-        } else if (const char* value = std::getenv(variable.c_str())) {
-            session.environment.push_back(variable + "=" + value);
-        }
-    }
+    session.environment.push_back("PATH=" + options.programs +
+                                  (options.programs.empty() ? "" : ":") +
+                                  (path ? path : "/usr/bin:/bin"));
     return session;
 }
 
@@ -145,17 +157,43 @@ int RunTest(const TestOptions& options) {
     return !totals.isComplete ? notRunnable : totals.wrong ? EXIT_FAILURE : EXIT_SUCCESS;
 }
 
+int RunProbe(const TestOptions& options) {
+    try {
+        const std::chrono::seconds limit(options.limit);
+        return Probe({options.plugins, Variables(options.environment), limit, options.mayChange})
+                   ? EXIT_SUCCESS
+                   : EXIT_FAILURE;
+    } catch (const Interrupted& interrupt) {
+        EndBy(interrupt, "a call");
+    }
+}
+
 }  // namespace
 
 void AddTest(CLI::App& program, int& status) {
     auto options = std::make_shared<TestOptions>();
     CLI::App* verb = program.add_subcommand("test", description);
-    verb->add_option("FILE|FOLDER", options->paths, "Pages, or folders with pages that end in .md")
-        ->required();
+    CLI::Option* paths = verb->add_option("FILE|FOLDER", options->paths,
+                                          "Pages, or folders with pages that end in .md");
+    CLI::Option* probe =
+        verb->add_flag(
+                "--probe", options->isProbe,
+                "Without pages: call each command of the plugins with the values at the "
+                "ends of what its parameters take, with hostile ones and in poor "
+                "environments, and tell what breaks, hangs, runs a value or gives a document "
+                "of the wrong shape")
+            ->excludes(paths);
+    verb->add_option("--plugin", options->plugins, "What to probe, as often as wanted")
+        ->allow_extra_args(false)
+        ->needs(probe);
+    verb->add_flag("--yes", options->mayChange,
+                   "Probe commands as well that do not promise by their meta-data, read-only, to "
+                   "change nothing")
+        ->needs(probe);
     verb->add_flag("--update", options->isUpdate,
                    "Write what was printed into the pages, to be read before it is kept")
         ->envname("UPDATE_GOLDEN");
-    verb->add_option("--time-limit", options->limit, "Seconds for a page")
+    verb->add_option("--time-limit", options->limit, "Seconds for a page, or a call of a probe")
         ->check(CLI::Range(1U, 86400U))
         ->capture_default_str();
     verb->add_option("--path", options->programs, "A folder that comes first on the PATH");
@@ -165,7 +203,13 @@ void AddTest(CLI::App& program, int& status) {
     verb->add_option("--env", options->environment,
                      "A variable, NAME=VALUE, or NAME to hand on the caller's, as often as wanted")
         ->allow_extra_args(false);
-    verb->callback([options, &status] { status = RunTest(*options); });
+    verb->callback([options, &status] {
+        const bool isGiven = options->isProbe ? !options->plugins.empty() : !options->paths.empty();
+        if (!isGiven) {
+            throw CLI::RequiredError(options->isProbe ? "--plugin" : "FILE|FOLDER");
+        }
+        status = options->isProbe ? RunProbe(*options) : RunTest(*options);
+    });
 }
 
 }  // namespace Author

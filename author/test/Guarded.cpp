@@ -73,7 +73,9 @@ void EndChildren() {
     } while (waitpid(-1, nullptr, 0) > 0 || errno == EINTR);
 }
 
-[[noreturn]] void RunChild(const std::string& folder, const std::function<int()>& function) {
+// What is thrown must not reach the caller, who runs in the other process.
+[[noreturn]] void RunChild(const std::string& folder,
+                           const std::function<int()>& function) noexcept {
     setsid();
     const rlimit size{largestFile, largestFile};
     const int nothing = open("/dev/null", O_RDONLY | O_CLOEXEC);

@@ -130,8 +130,8 @@ private:
         for (const auto& [name, value] : _parser.GetDispatcherParameters()) {
             path.push_front(value);
             if (Follow(root, path)) {
-                return Dashed(name) + " took '" + value +
-                       "' for its value. Options of a command stand behind its path.";
+                return Dashed(name) + " took '" + value + "' for its value." +
+                       (IsToolOption(name) ? "" : " Options of a command stand behind its path.");
             }
             path.pop_front();
         }
@@ -157,7 +157,9 @@ private:
 
     std::string HintOnBareWord(const std::string& word) {
         const ParameterSpec* required = OnlyRequired(*_command->GetInputSpec());
-        if (!required || word != _parser.GetCommandPath().back() || !IsPlain(word)) {
+        // In name=value, the value is but a part of the word.
+        if (!required || word != _parser.GetCommandPath().back() || !IsPlain(word) ||
+            word.find('=') != std::string::npos) {
             return SeeHelp();
         }
         return "A value follows its option: " + _lead + _path + " --" + required->GetName() + " " +

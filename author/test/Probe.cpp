@@ -1,7 +1,7 @@
 #include <author/Files.h>
 #include <author/test/Guarded.h>
 #include <author/test/Probe.h>
-#include <author/test/Trials.h>
+#include <author/test/ProbeCalls.h>
 
 #include <fcntl.h>
 #include <unistd.h>
@@ -49,25 +49,25 @@ std::string Shown(const std::string& value) {
     return "'" + text + "'";
 }
 
-std::string Shown(const Trial& trial) {
-    std::string text = trial.environment == Trial::Environment::NoLang ? " without LANG"
-                       : trial.environment == Trial::Environment::Empty
+std::string Shown(const ProbeCall& call) {
+    std::string text = call.environment == ProbeCall::Environment::NoLang ? " without LANG"
+                       : call.environment == ProbeCall::Environment::Empty
                            ? " with an empty environment"
                            : "";
-    for (const auto& [name, value] : trial.parameters) {
+    for (const auto& [name, value] : call.parameters) {
         text += " --" + name + (value.empty() ? "" : " " + Shown(value));
     }
     return text;
 }
 
-int Call(AutoCli::Dispatcher& dispatcher, AutoCli::Command& command, const Trial& trial,
+int Call(AutoCli::Dispatcher& dispatcher, AutoCli::Command& command, const ProbeCall& call,
          std::vector<std::string> environment) {
     const int streams = open("../printed", O_WRONLY | O_CREAT | O_CLOEXEC, 0600);
     dup2(streams, STDOUT_FILENO);
     dup2(streams, STDERR_FILENO);
-    if (trial.environment == Trial::Environment::NoLang) {
+    if (call.environment == ProbeCall::Environment::NoLang) {
         unsetenv("LANG");
-    } else if (trial.environment == Trial::Environment::Empty) {
+    } else if (call.environment == ProbeCall::Environment::Empty) {
         clearenv();
     }
     for (std::string& variable : environment) {
@@ -76,7 +76,7 @@ int Call(AutoCli::Dispatcher& dispatcher, AutoCli::Command& command, const Trial
     const auto input = AutoCli::CommandInput::New();
     const auto output = AutoCli::CommandOutput::New();
     input->SetCommandPath(command.GetPath());
-    for (const auto& [name, value] : trial.parameters) {
+    for (const auto& [name, value] : call.parameters) {
         input->AddParameter(name, value);
     }
     dispatcher.ExecuteCommand(input, output);
@@ -97,7 +97,7 @@ bool IsBroken(const std::string& errors) {
 }
 
 // What is wrong with what came of a call; empty for nothing.
-std::string Verdict(const Trial& trial, const std::string& folder) {
+std::string Verdict(const ProbeCall& call, const std::string& folder) {
     if (fs::exists(folder + "/work/" + canary)) {
         return "a value ran as a command of the shell";
     }
@@ -105,7 +105,7 @@ std::string Verdict(const Trial& trial, const std::string& folder) {
         return "the process of the call crashed";
     }
     const std::string errors = ReadFile(folder + "/errors");
-    if (trial.isIncomplete && errors.empty()) {
+    if (call.isIncomplete && errors.empty()) {
         return "it runs without a required parameter";
     }
     if (!IsBroken(errors)) {
@@ -137,8 +137,8 @@ public:
             std::string unknown;
             if (!_options.mayChange && !command->IsReadOnly()) {
                 LeaveOut(*command, "it may change something, which --yes allows");
-            } else if (const auto trials = TrialsOf(*command, unknown)) {
-                RunTrials(*command, *trials);
+            } else if (const auto calls = ProbeCallsOf(*command, unknown)) {
+                RunCalls(*command, *calls);
             } else {
                 LeaveOut(*command, "no value was found that --" + unknown + " takes");
             }
@@ -158,22 +158,22 @@ private:
     }
 
     // What hangs, or breaks when it is given next to nothing, is not called again.
-    void RunTrials(AutoCli::Command& command, const std::vector<Trial>& trials) {
+    void RunCalls(AutoCli::Command& command, const std::vector<ProbeCall>& calls) {
         bool goesOn = true;
-        for (size_t i = 0; i < trials.size() && goesOn; ++i) {
+        for (size_t i = 0; i < calls.size() && goesOn; ++i) {
             const TemporaryFolder folder;
             const std::string work = folder.GetPath() + "/work";
             fs::create_directory(work);
             const bool hasEnded = RunGuarded(work, _options.limit, [&] {
-                return Call(_dispatcher, command, trials[i], _options.environment);
+                return Call(_dispatcher, command, calls[i], _options.environment);
             });
             const std::string verdict =
-                hasEnded ? Verdict(trials[i], folder.GetPath()) : "it does not end in time";
+                hasEnded ? Verdict(calls[i], folder.GetPath()) : "it does not end in time";
             goesOn = hasEnded && (i > 0 || verdict.empty());
             ++_calls;
             if (!verdict.empty()) {
                 ++_wrong;
-                std::cout << command.GetPathString(' ') << Shown(trials[i]) << ": " << verdict
+                std::cout << command.GetPathString(' ') << Shown(calls[i]) << ": " << verdict
                           << '\n';
             }
         }

@@ -10,14 +10,14 @@
 namespace Author {
 
 /// One call of a command.
-struct Trial {
+struct ProbeCall {
     enum class Environment { Whole, NoLang, Empty };
 
     std::vector<std::pair<std::string, std::string>> parameters;  ///< names with values
     Environment environment = Environment::Whole;
     bool isIncomplete = false;  ///< a required parameter is missing
 
-    bool operator==(const Trial&) const = default;
+    bool operator==(const ProbeCall&) const = default;
 };
 
 /// The file that a value makes when a shell runs it.
@@ -27,6 +27,6 @@ inline constexpr const char* canary = "canary";
 /// values at the ends of what its constraint lets through and with hostile ones, a required one
 /// missing, and another environment. Nothing when no value was found for a required parameter,
 /// which `unknown` gets.
-std::optional<std::vector<Trial>> TrialsOf(AutoCli::Command& command, std::string& unknown);
+std::optional<std::vector<ProbeCall>> ProbeCallsOf(AutoCli::Command& command, std::string& unknown);
 
 }  // namespace Author

@@ -1,4 +1,4 @@
-#include <author/test/Trials.h>
+#include <author/test/ProbeCalls.h>
 
 #include <algorithm>
 
@@ -81,9 +81,10 @@ std::vector<std::string> HostileValues(const std::string& name) {
 
 }  // namespace
 
-std::optional<std::vector<Trial>> TrialsOf(AutoCli::Command& command, std::string& unknown) {
+std::optional<std::vector<ProbeCall>> ProbeCallsOf(AutoCli::Command& command,
+                                                   std::string& unknown) {
     const auto& specs = command.GetInputSpec()->GetParameterSpecs();
-    Trial least;
+    ProbeCall least;
     for (const auto& spec : specs) {
         if (spec->IsRequired()) {
             const auto values = PlainValues(*spec);
@@ -94,15 +95,15 @@ std::optional<std::vector<Trial>> TrialsOf(AutoCli::Command& command, std::strin
             least.parameters.emplace_back(spec->GetName(), values.front());
         }
     }
-    std::vector<Trial> trials = {least,
-                                 {least.parameters, Trial::Environment::NoLang},
-                                 {least.parameters, Trial::Environment::Empty}};
+    std::vector<ProbeCall> calls = {least,
+                                    {least.parameters, ProbeCall::Environment::NoLang},
+                                    {least.parameters, ProbeCall::Environment::Empty}};
     for (const auto& spec : specs) {
         const std::string name = spec->GetName();
-        Trial without = least;
+        ProbeCall without = least;
         std::erase_if(without.parameters, [&](const auto& given) { return given.first == name; });
         if (spec->IsRequired()) {
-            trials.push_back({without.parameters, Trial::Environment::Whole, true});
+            calls.push_back({without.parameters, ProbeCall::Environment::Whole, true});
         }
         std::vector<std::string> values =
             name == "help" ? std::vector<std::string>{""} : PlainValues(*spec);
@@ -110,14 +111,14 @@ std::optional<std::vector<Trial>> TrialsOf(AutoCli::Command& command, std::strin
             std::ranges::move(HostileValues(name), std::back_inserter(values));
         }
         for (const std::string& value : values) {
-            Trial trial = without;
-            trial.parameters.emplace_back(name, value);
-            if (trial != least) {
-                trials.push_back(std::move(trial));
+            ProbeCall call = without;
+            call.parameters.emplace_back(name, value);
+            if (call != least) {
+                calls.push_back(std::move(call));
             }
         }
     }
-    return trials;
+    return calls;
 }
 
 }  // namespace Author

@@ -9,6 +9,10 @@
 
 #include <gtest/gtest.h>
 
+#include <libxml/xmlmemory.h>
+
+#include <cstdlib>
+#include <cstring>
 #include <ctime>
 #include <locale>
 #include <sstream>
@@ -216,6 +220,29 @@ TEST_F(XmlOutput, DefusesEntityBombs) {
                    "'>]><o><structure typeName='A'>" + fields + "</structure></o>"),
               refused);
     EXPECT_LT(std::clock() - begin, 3 * CLOCKS_PER_SEC);
+}
+
+// Each allocation of libxml2 fails once. It may stop then, and take what it has for a document.
+TEST_F(XmlOutput, IsWholeOrRefusedWhenMemoryRunsShort) {
+    static int left = 0;
+    static const auto allocate = +[](void* memory, size_t size) {
+        return left-- != 0 ? std::realloc(memory, size) : nullptr;
+    };
+    const std::string whole = "String " + std::string(1000, 'c');
+    for (int room = 0; left <= 0; ++room) {
+        left = room;
+        std::string read = "none";
+        xmlMemSetup(
+            std::free, [](size_t size) { return allocate(nullptr, size); }, allocate, strdup);
+        try {
+            read = Read("<o><string><![CDATA[" + whole.substr(7) + "]]></string></o>");
+        } catch (const std::bad_alloc&) {
+        }
+        xmlMemSetup(std::free, std::malloc, std::realloc, strdup);
+        EXPECT_TRUE(read == whole || read == "none" ||
+                    read == "! There was not enough memory for the whole document")
+            << room << ": " << read;
+    }
 }
 
 TEST(StreamInt, ReadsAsAStreamDoes) {

@@ -215,6 +215,9 @@ TEST_F(XmlOutput, DefusesEntityBombs) {
     EXPECT_EQ(Read(laughs + "]><o><string>&a11;</string></o>"), "none");
     EXPECT_EQ(Read(laughs + "]><o><structure typeName='&a11;'/></o>"), "none");
     EXPECT_EQ(Read(large + "<o><structure typeName='" + references + "'/></o>"), refused);
+    EXPECT_EQ(Read("<!DOCTYPE o [<!ENTITY e '" + std::string(2000000, 'a') +
+                   "'><!ENTITY f '&e;&e;'>]><o><structure typeName='&f;&f;&f;'/></o>"),
+              refused);
     EXPECT_EQ(Read(large + "<o><list type='string'>" + items + "</list></o>"), refused);
     EXPECT_EQ(Read("<!DOCTYPE o [<!ATTLIST field name CDATA '" + std::string(100000, 'a') +
                    "'>]><o><structure typeName='A'>" + fields + "</structure></o>"),

@@ -10,6 +10,7 @@ class App;
 namespace Author {
 
 /// `status` becomes the exit status of the program: 0, or 1 when something was found.
+void AddDoc(CLI::App& program, int& status);
 void AddLint(CLI::App& program, int& status);
 void AddNew(CLI::App& program, int& status);
 void AddSchema(CLI::App& program, int& status);

@@ -20,6 +20,7 @@ int Run(int argc, char** argv) {
     program.set_version_flag("--version", "zelmar " ZELMAR_VERSION);
     program.require_subcommand(1);
     int status = EXIT_SUCCESS;
+    Author::AddDoc(program, status);
     Author::AddLint(program, status);
     Author::AddNew(program, status);
     Author::AddSchema(program, status);

@@ -12,8 +12,9 @@ namespace Author {
 namespace {
 
 constexpr size_t mostPaired = 20;
-constexpr std::string_view markBegin = "Zq";
-constexpr std::string_view markEnd = "qZ";
+// Longer than what mkdtemp(3) makes up, so that the path of no temporary folder holds one.
+constexpr std::string_view markBegin = "Zqvalue";
+constexpr std::string_view markEnd = "eulavqZ";
 constexpr std::string_view probe = ";'\"";
 
 std::string MarkOf(size_t parameter, char value) {

@@ -33,6 +33,7 @@ std::ofstream Open(const std::string& file) {
 
 void Print(const List& list, const std::string& formatter, const std::string& file) {
     static AutoCli::Dispatcher dispatcher;
+    [[maybe_unused]] static const bool hasAll = (dispatcher.AddPlugin(FORMATS), true);
     const auto output = AutoCli::CommandOutput::New();
     output->SetRootObject(list);
     AutoCli::FormatParameters parameters;
@@ -74,7 +75,8 @@ void CompareJson(const List& list, const std::string& folder) {
 // By the byte, for each gives another text; a copy of the text is what the file alone costs.
 void CompareFormatters(const List& list, const std::string& folder) {
     std::vector<Paired::Contender> contenders;
-    for (const char* name : {"table", "simple", "json", "xml", "python"}) {
+    for (const char* name : {"table", "simple", "json", "xml", "python", "csv", "tsv", "jsonl",
+                             "yaml", "markdown", "html"}) {
         const std::string file = folder + "/" + name;
         const auto print = [&list, file, name] { Print(list, name, file); };
         const long growth = Memory::GrowthWhile(print);

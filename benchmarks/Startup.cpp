@@ -11,4 +11,11 @@ int main() {
                     {{"kelvash", kelvash},
                      {"its libraries, one expression, one line", floor, "at most 1.3"},
                      {"the same without libzelmar", bareFloor}});
+    Paired::Compare(
+        "start-up with the plugin of further formats", 300,
+        {{"with it",
+          [] {
+              Paired::RunProgram({.words = {KELVASH, "--plugin", FORMATS}, .status = 1});
+          }},
+         {"without", kelvash, "at most 1.15"}});
 }

@@ -1,5 +1,7 @@
 #include "Delimited.h"
 
+#include <algorithm>
+
 #include "Rows.h"
 #include "Text.h"
 
@@ -29,7 +31,8 @@ public:
     static constexpr std::string_view lineEnd = "\r\n";
 
     static void AppendText(Text& out, std::string_view text, bool isOnly) {
-        const bool isPlain = text.find_first_of(",\"\r\n") == std::string_view::npos;
+        const bool isPlain = std::ranges::none_of(
+            text, [](char c) { return c == ',' || c == '"' || c == '\r' || c == '\n'; });
         if (isPlain && !(isOnly && text.empty())) {  // readers pass over an empty line
             out.Append(text);
             return;
@@ -92,7 +95,7 @@ bool Write(const CallSpec::Output& output, const AutoCli::FormatParameters& para
             separate(column);
         }
     }
-    stream.flush();
+    text.Finish();
     return true;
 }
 

@@ -135,6 +135,6 @@ bool HtmlFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
         text.Append("</tr>\n");
     }
     text.Append(foot);
-    stream.flush();
+    text.Finish();
     return true;
 }

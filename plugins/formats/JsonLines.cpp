@@ -27,6 +27,6 @@ bool JsonLinesFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
     } else {
         writeLine(root.get());
     }
-    stream.flush();
+    text.Finish();
     return true;
 }

@@ -68,6 +68,6 @@ bool MarkdownFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
     for (size_t row = 0; row < rows.Count(); ++row) {
         writeLine([&](size_t column) { AppendCell(text, rows, row, column); });
     }
-    stream.flush();
+    text.Finish();
     return true;
 }

@@ -95,9 +95,17 @@ const Rows::Value& Rows::Find(const Value& item, size_t column) {
         return _found = nullptr;
     }
     const std::string& name = _columns[column];
-    if (const auto field = structure->GetFields().find(name);
-        field != structure->GetFields().end()) {
-        return field->second.value;  // also when it has dots in its name
+    const auto& fields = structure->GetFields();
+    // Columns mostly stand in the order of the fields: then the next one needs no search.
+    if (structure != _structure) {
+        _structure = structure;
+        _next = fields.begin();
+    }
+    if (_next == fields.end() || _next->first != name) {
+        _next = fields.find(name);
+    }
+    if (_next != fields.end()) {
+        return (_next++)->second.value;  // also when it has dots in its name
     }
     return _found = name.find('.') == std::string::npos
                         ? nullptr

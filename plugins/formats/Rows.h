@@ -2,6 +2,7 @@
 
 #include <zelmar/zelmar.h>
 
+#include <map>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -41,6 +42,8 @@ private:
     Value _sample;                   // the struct whose fields the columns are; null without one
     std::vector<std::string> _columns;
     AutoCli::FormatParameters _formats;
+    const MetaObj::MetaStruct* _structure = nullptr;  // the one that was looked at last
+    std::map<std::string, MetaObj::MetaStruct::Field>::const_iterator _next;
     Value _found;
     std::string _text;
 };

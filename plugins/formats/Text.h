@@ -1,26 +1,45 @@
 #pragma once
 
+#include <array>
 #include <ostream>
 #include <string_view>
 
-/// Writes to the buffer of a stream, without what the stream does around each piece. The engine
-/// gathers the pieces in blocks.
+/// Gathers what a formatter writes, so that many small pieces become few writes. `Finish` belongs
+/// at the end: it writes the rest and flushes the stream.
 class Text {
 public:
     explicit Text(std::ostream& out) : _out(out) {}
+    Text(const Text&) = delete;
+    Text& operator=(const Text&) = delete;
 
     template <class... Pieces>
     void Append(const Pieces&... pieces) {
         (AppendPiece(pieces), ...);
     }
 
+    void Finish() {
+        Write({_buffer.data(), _used});
+        _out.flush();
+    }
+
 private:
     void AppendPiece(std::string_view piece) {
-        const auto size = static_cast<std::streamsize>(piece.size());
-        if (_out.rdbuf()->sputn(piece.data(), size) != size) {
-            _out.setstate(std::ios_base::badbit);
+        if (piece.size() > _buffer.size() - _used) {
+            Write({_buffer.data(), _used});
+            _used = 0;
+        }
+        if (piece.size() > _buffer.size()) {
+            Write(piece);
+        } else {
+            _used += piece.copy(_buffer.data() + _used, piece.size());
         }
     }
 
+    void Write(std::string_view text) {
+        _out.write(text.data(), static_cast<std::streamsize>(text.size()));
+    }
+
     std::ostream& _out;
+    size_t _used = 0;
+    std::array<char, 4096> _buffer;  // not initialised: it is read only as far as it was written
 };

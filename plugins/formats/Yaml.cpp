@@ -253,6 +253,6 @@ bool YamlFormatter::Format(const std::shared_ptr<CallSpec::Output>& output,
     Text text(stream);
     YamlWriter writer(text);
     MetaObj::ValueWalk<YamlWriter>(writer).Run(root.get(), 0);
-    stream.flush();
+    text.Finish();
     return true;
 }

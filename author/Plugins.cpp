@@ -20,10 +20,15 @@ void LoadPlugins(AutoCli::CliDispatcher& dispatcher, const PluginOptions& option
         dispatcher.AddExternalDirectory(folder);
     }
     for (const std::string& file : options.files) {
+        const size_t count = dispatcher.GetPluginNames().size();
         try {
             dispatcher.AddPlugin(file);
         } catch (const Zelmar::ZelmarException& error) {
             throw std::runtime_error("Unable to load plugin " + file + ": " + error.what());
+        }
+        if (dispatcher.GetPluginNames().size() == count) {
+            throw std::runtime_error("Unable to load plugin " + file +
+                                     ": its name ends neither in .so nor in .xml");
         }
     }
 }

@@ -144,10 +144,17 @@ bool Server::WaitAndTransfer() {
     if (events[0].revents != 0) {
         _inputEnded = !_input.Read(_inputDescriptor);
     }
-    if ((events[1].revents & POLLOUT) != 0) {
-        return _output.Write(_outputDescriptor);
+    if ((events[1].revents & POLLOUT) == 0) {
+        return (events[1].revents & (POLLERR | POLLHUP)) == 0;
     }
-    return (events[1].revents & (POLLERR | POLLHUP)) == 0;
+    if (_output.Write(_outputDescriptor)) {
+        return true;
+    }
+    if (errno != EPIPE) {  // that a client has gone is no news to anybody
+        std::cerr << "kelvash-mcp: Unable to write to standard output: " << std::strerror(errno)
+                  << std::endl;
+    }
+    return false;
 }
 
 std::optional<timespec> Server::TimeToNextEvent() const {

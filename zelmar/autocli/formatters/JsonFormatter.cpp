@@ -1,4 +1,4 @@
-#include <zelmar/autocli/formatters/Escape.h>
+#include <zelmar/autocli/formatters/JsonEscapes.h>
 #include <zelmar/autocli/formatters/JsonFormatter.h>
 #include <zelmar/autocli/formatters/ValueWriter.h>
 
@@ -11,27 +11,11 @@ namespace AutoCli {
 
 namespace {
 
-constexpr EscapeTable MakeEscapes() {
-    constexpr std::string_view digits = "0123456789abcdef";
-    EscapeTable escapes;
-    for (unsigned byte = 0; byte < 0x100; ++byte) {
-        if (byte < 0x20 || byte >= 0x7F) {
-            const char code[] = {'\\', 'u', '0', '0', digits[byte >> 4], digits[byte & 0xF]};
-            escapes.Set(static_cast<unsigned char>(byte), {code, sizeof code});
-        }
-    }
-    escapes.Set('"', "\\\"");
-    escapes.Set('\\', "\\\\");
-    escapes.Set('/', "\\/");
-    escapes.Set('\b', "\\b");
-    escapes.Set('\t', "\\t");
-    escapes.Set('\n', "\\n");
-    escapes.Set('\f', "\\f");
-    escapes.Set('\r', "\\r");
-    return escapes;
-}
-
-constexpr EscapeTable escapes = MakeEscapes();
+constexpr EscapeTable escapes = [] {
+    EscapeTable table = JsonEscapes(0x7F);
+    table.Set('/', "\\/");
+    return table;
+}();
 
 class JsonWriter : public ValueWriter {
 public:

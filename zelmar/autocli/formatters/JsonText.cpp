@@ -1,4 +1,4 @@
-#include <zelmar/autocli/formatters/Escape.h>
+#include <zelmar/autocli/formatters/JsonEscapes.h>
 #include <zelmar/autocli/formatters/JsonText.h>
 #include <zelmar/internal/Utf8.h>
 #include <zelmar/metaobj/ValueWalk.h>
@@ -14,24 +14,7 @@ namespace {
 
 using Append = std::function<void(std::string_view)>;
 
-constexpr EscapeTable MakeEscapes() {
-    constexpr std::string_view digits = "0123456789abcdef";
-    EscapeTable escapes;
-    for (unsigned char byte = 0; byte < 0x20; ++byte) {
-        const char code[] = {'\\', 'u', '0', '0', digits[byte >> 4], digits[byte & 0xF]};
-        escapes.Set(byte, {code, sizeof code});
-    }
-    escapes.Set('"', "\\\"");
-    escapes.Set('\\', "\\\\");
-    escapes.Set('\b', "\\b");
-    escapes.Set('\t', "\\t");
-    escapes.Set('\n', "\\n");
-    escapes.Set('\f', "\\f");
-    escapes.Set('\r', "\\r");
-    return escapes;
-}
-
-constexpr EscapeTable escapes = MakeEscapes();
+constexpr EscapeTable escapes = JsonEscapes();
 
 class JsonTextWriter {
 public:

@@ -37,6 +37,7 @@ for wait, keys in zip(sys.argv[1:cut:2], sys.argv[2:cut:2]):
         if not wait.startswith("*") or not echoes():
             break
         time.sleep(0.01)
+    time.sleep(0.2)  # a prompt is shown before its line is read: what is typed between may be lost
     seen = len(shown)
     os.write(terminal, keys.encode().decode("unicode_escape").encode())
 while read_on():
